@@ -1,0 +1,14 @@
+#!/usr/bin/env bash
+# Builds and runs every test: a normal build, then the same suite under ASan+UBSan.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+scripts/install-deps.sh
+
+echo "== build and test"
+scripts/build.sh build -DONDREL_WERROR=ON
+(cd build && ctest --output-on-failure -j "$(nproc)")
+
+echo "== build and test under ASan+UBSan"
+BUILD_TYPE=Debug scripts/build.sh build-asan -DONDREL_SANITIZE=address -DONDREL_WERROR=ON
+(cd build-asan && ASAN_OPTIONS=detect_leaks=1:abort_on_error=1 UBSAN_OPTIONS=print_stacktrace=1 \
+   ctest --output-on-failure -j "$(nproc)")

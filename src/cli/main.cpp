@@ -1,0 +1,52 @@
+#include <cstring>
+#include <iostream>
+
+#include "cli/commands.h"
+
+namespace {
+
+struct Command {
+    const char* name;
+    const char* summary;
+    int (*run)(const ondrel::Args&);
+};
+
+const Command kCommands[] = {
+    {"info", "info [--json] FILE     show a module: tempo, sequence, patterns, samples, effects",
+     ondrel::cmd_info},
+    {"convert", "convert FILE -o OUT    save any module the program reads as a .otm module",
+     ondrel::cmd_convert},
+};
+
+void usage(std::ostream& out) {
+    out << "Ondrel Tracker " ONDREL_VERSION "\n\n"
+           "usage: ondrel COMMAND [OPTIONS] FILE\n\n"
+           "commands:\n";
+    for (const auto& c : kCommands) out << "  " << c.summary << "\n";
+    out << "\n'ondrel COMMAND --help' tells more about one command.\n"
+           "Exit status: 0 done, 1 the file or device failed, 2 the command line was wrong.\n";
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    if (argc < 2) {
+        usage(std::cerr);
+        std::cerr << "\nThe desktop window is not part of this build yet; use a command above.\n";
+        return ondrel::kExitUsage;
+    }
+    const std::string first = argv[1];
+    if (first == "-h" || first == "--help" || first == "help") {
+        usage(std::cout);
+        return ondrel::kExitOk;
+    }
+    if (first == "--version") {
+        std::cout << "ondrel " ONDREL_VERSION "\n";
+        return ondrel::kExitOk;
+    }
+    for (const auto& c : kCommands)
+        if (first == c.name) return c.run(ondrel::Args(argv + 2, argv + argc));
+    std::cerr << "ondrel: unknown command '" << first << "'\n\n";
+    usage(std::cerr);
+    return ondrel::kExitUsage;
+}

@@ -1,0 +1,22 @@
+#pragma once
+#include "song/alerts.h"
+#include "song/effect_slots.h"
+#include "song/song_bank.h"
+
+namespace ondrel {
+
+// The program's shared state: every subsystem's tables live here, not in globals, so
+// tests can hold as many engines as they like.
+class Engine {
+public:
+    explicit Engine(AlertSink* alerts = nullptr)
+        : bank(alerts ? alerts : &alert_log), slots() {}
+    Engine(const Engine&) = delete;
+    Engine& operator=(const Engine&) = delete;
+
+    AlertLog alert_log;  // where alerts go when nobody draws them
+    SongBank bank;
+    EffectSlots slots;
+};
+
+}  // namespace ondrel

@@ -1,0 +1,46 @@
+#pragma once
+#include <array>
+#include <cstdint>
+#include <memory>
+#include <string>
+
+#include "song/structure_lock.h"
+#include "song/tmod.h"
+
+namespace ondrel {
+
+inline constexpr int kSendBufferBytes = 20480;
+inline constexpr int kSendBufferFloats = kSendBufferBytes / 4;
+inline constexpr int kFirstClonedSlot = 20;
+inline constexpr uint32_t kMaxEchoFrames = 441000;  // 10 s: bound for lengths from files
+
+// The effect-slot tables shared by all songs, and the memory the audio thread uses for
+// them. Everything here is reserved on the GUI side before the audio thread can need it.
+struct EffectSlots {
+    EffectSlots();
+
+    std::array<int16_t, kEffectSlots> efxtype{};
+    // Serial number of each effect buffer a loaded song names (0 = none), and their count.
+    std::array<int16_t, kEffectSlots> bufnumber{};
+    int nbbufferefx = 0;
+    // Send buffers by compact number - 1, 20480 bytes each, never freed once made.
+    std::array<std::unique_ptr<float[]>, kEffectSlots> pbufferefx;
+    // Echo lines by echo unit: 4 x length + 1024 bytes.
+    std::array<std::unique_ptr<float[]>, kEchoUnits> echoefx;
+    std::array<uint32_t, kEchoUnits> sizeecho{};
+
+    // Gives buffer number slot the next serial number unless it has one.
+    void number_buffer(int slot);
+    void clear_numbering();
+    // Makes sure send buffers 0 .. count - 1 exist; returns false if memory ran out.
+    bool reserve_send_buffers(int count);
+    // Makes echo unit's line hold length frames (4 x length + 1024 bytes); the new line
+    // is swapped in under lock, since the audio thread may be running the old one.
+    bool reserve_echo_line(int unit, uint32_t length, StructureLock& lock);
+};
+
+bool is_basic_effect_type(int type);
+// Label of a slot in the menu of added effects, e.g. "(21) Echo, Delay".
+std::string added_effect_label(int slot, int type);
+
+}  // namespace ondrel

@@ -1,0 +1,83 @@
+#pragma once
+#include <array>
+#include <atomic>
+#include <cstdint>
+#include <memory>
+#include <vector>
+
+#include "song/alerts.h"
+#include "song/pattern.h"
+#include "song/sample.h"
+#include "song/structure_lock.h"
+#include "song/tmod.h"
+
+namespace ondrel {
+
+// One song's record with its patterns and samples, built on the side (by a reader or a
+// test) and then installed into the bank in one swap.
+struct SongData {
+    SongData();
+    std::unique_ptr<TMOD> mod;
+    std::array<PatternRef, kPatternsPerSong> patterns;
+    std::array<SampleRef, kSamplesPerSong> samples;
+};
+
+// The songs in memory and the global pattern and sample tables they share.
+class SongBank {
+public:
+    explicit SongBank(AlertSink* alerts = nullptr);
+    ~SongBank();
+    SongBank(const SongBank&) = delete;
+    SongBank& operator=(const SongBank&) = delete;
+
+    std::array<std::unique_ptr<TMOD>, kMaxSongs> timod;
+    int16_t nbimod = 0;
+    int16_t noimod = 0;
+    uint8_t fmulload = 0;
+    std::vector<PatternRef> p_pat;  // nbimod x 128
+    std::vector<SampleRef> t_sound;  // nbimod x 128
+    int16_t nbvoie = 0;
+    // Set while a whole song is swapped in; the render callback then renders silence.
+    std::atomic<uint8_t> loadin{0};
+
+    void set_alerts(AlertSink* alerts) { alerts_ = alerts; }
+    AlertSink* alerts() const { return alerts_; }
+    void set_structure_lock(StructureLock* lock) { lock_ = lock ? lock : &no_lock_; }
+    StructureLock& structure_lock() { return *lock_; }
+
+    TMOD& current() { return *timod[noimod]; }
+    const TMOD& current() const { return *timod[noimod]; }
+    Pattern* pattern(int global) const;
+    p_s* sample(int global) const;
+    // Local pattern / sample number of the current song.
+    Pattern* song_pattern(int local) const { return pattern(current().patbase + local); }
+    p_s* song_sample(int local) const { return sample(current().sndbase + local); }
+
+    // Adds a song slot; 0 when 63 songs are held already.
+    int addmusic();
+    // A new song with the defaults, made current. False (and an alert) when refused.
+    bool newmusic();
+    void patcreate(int pattern, short tracks);
+    void Gofree(int pattern);
+    void Raz_data(int sample);
+    void updatenbvoice(short tracks);
+    // Frees the current song; the bank always keeps one song.
+    void killmusic();
+    // Makes song current.
+    void select(int song);
+
+    // Replaces song's record, patterns and samples with data (whose base indices are
+    // rewritten for the slot), under the structure lock; the old ones are freed after.
+    void install(int song, SongData&& data);
+    // Copy of song's record with new-song defaults, for a reader to start from.
+    std::unique_ptr<TMOD> default_record(int song) const;
+
+private:
+    void free_song_data(int song);
+
+    AlertSink* alerts_;
+    NoStructureLock no_lock_;
+    StructureLock* lock_ = &no_lock_;
+};
+
+}  // namespace ondrel
