@@ -1,4 +1,5 @@
 #pragma once
+#include "playback/player.h"
 #include "song/alerts.h"
 #include "song/effect_slots.h"
 #include "song/song_bank.h"
@@ -10,13 +11,14 @@ namespace ondrel {
 class Engine {
 public:
     explicit Engine(AlertSink* alerts = nullptr)
-        : bank(alerts ? alerts : &alert_log), slots() {}
+        : bank(alerts ? alerts : &alert_log), slots(), player(bank, slots) {}
     Engine(const Engine&) = delete;
     Engine& operator=(const Engine&) = delete;
 
     AlertLog alert_log;  // where alerts go when nobody draws them
     SongBank bank;
     EffectSlots slots;
+    Player player;
 };
 
 }  // namespace ondrel

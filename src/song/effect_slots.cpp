@@ -32,13 +32,15 @@ void EffectSlots::clear_numbering() {
 }
 
 bool EffectSlots::reserve_send_buffers(int count) {
-    bool ok = true;
-    for (int k = 0; k < count && k < kEffectSlots; ++k) {
-        if (pbufferefx[k]) continue;
+    count = std::min(count, kEffectSlots);
+    int ready = nsendbuffers.load(std::memory_order_relaxed);
+    for (int k = ready; k < count; ++k) {
         pbufferefx[k].reset(new (std::nothrow) float[kSendBufferFloats]());
-        ok = ok && pbufferefx[k] != nullptr;
+        if (!pbufferefx[k]) break;
+        ready = k + 1;
     }
-    return ok;
+    nsendbuffers.store(ready, std::memory_order_release);
+    return ready >= count;
 }
 
 bool EffectSlots::reserve_echo_line(int unit, uint32_t length, StructureLock& lock) {

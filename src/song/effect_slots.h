@@ -1,5 +1,6 @@
 #pragma once
 #include <array>
+#include <atomic>
 #include <cstdint>
 #include <memory>
 #include <string>
@@ -23,8 +24,10 @@ struct EffectSlots {
     // Serial number of each effect buffer a loaded song names (0 = none), and their count.
     std::array<int16_t, kEffectSlots> bufnumber{};
     int nbbufferefx = 0;
-    // Send buffers by compact number - 1, 20480 bytes each, never freed once made.
+    // Send buffers by compact number - 1, 20480 bytes each, never freed once made. The
+    // audio thread uses only the first nsendbuffers of them.
     std::array<std::unique_ptr<float[]>, kEffectSlots> pbufferefx;
+    std::atomic<int> nsendbuffers{0};
     // Echo lines by echo unit: 4 x length + 1024 bytes.
     std::array<std::unique_ptr<float[]>, kEchoUnits> echoefx;
     std::array<uint32_t, kEchoUnits> sizeecho{};

@@ -8,14 +8,15 @@ int Pattern::allocated_tracks() const {
     return n;
 }
 
-void Pattern::allocate(int tracks, int rows) {
+void Pattern::allocate(int tracks) {
     for (int t = 0; t < tracks && t < kTracks; ++t)
-        if (!col[t]) col[t] = std::make_unique<TNOTE[]>(static_cast<size_t>(rows > 0 ? rows : 1));
+        if (!col[t]) col[t] = std::make_unique<TNOTE[]>(static_cast<size_t>(nrows));
 }
 
 PatternRef make_pattern(int tracks, int rows) {
     auto p = std::make_unique<Pattern>();
-    p->allocate(tracks, rows);
+    p->nrows = rows > 0 ? rows : 1;
+    p->allocate(tracks);
     return p;
 }
 

@@ -110,10 +110,9 @@ void SongBank::updatenbvoice(short tracks) {
     for (int p = 0; p < kPatternsPerSong; ++p) {
         Pattern* pat = pattern(m.patbase + p);
         if (!pat) continue;
-        const int rows = std::max<int>(m.rows[p], 1);
         std::array<std::unique_ptr<TNOTE[]>, kTracks> fresh;
         for (int t = 0; t < tracks; ++t)
-            if (!pat->col[t]) fresh[t] = std::make_unique<TNOTE[]>(static_cast<size_t>(rows));
+            if (!pat->col[t]) fresh[t] = std::make_unique<TNOTE[]>(static_cast<size_t>(pat->nrows));
         std::lock_guard<StructureLock> guard(*lock_);
         for (int t = 0; t < tracks; ++t)
             if (fresh[t]) pat->col[t] = std::move(fresh[t]);

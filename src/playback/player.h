@@ -1,0 +1,86 @@
+#pragma once
+#include <array>
+#include <atomic>
+#include <cstdint>
+#include <vector>
+
+#include "playback/messages.h"
+#include "playback/midi_out.h"
+#include "playback/transport.h"
+#include "playback/voice.h"
+#include "song/effect_slots.h"
+#include "song/song_bank.h"
+
+namespace ondrel {
+
+inline constexpr uint32_t kMsgStop = fourcc("stop");
+inline constexpr uint32_t kMsgActi = fourcc("acti");
+inline constexpr uint32_t kMsgDoup = fourcc("doup");
+
+// The sequencer and its state: transport, voice list, polyphony counters, MIDI sending.
+// gere_play runs on the audio thread; start, stop and the auditions on the window thread.
+class Player {
+public:
+    Player(SongBank& bank, EffectSlots& slots);
+
+    Transport tr;
+    EditCursor cursor;
+    std::array<Voice, kVoices> nlist{};
+    std::array<int16_t, kVoices> polytotrack{};
+    std::array<int16_t, kVoices> polytour{};
+    std::array<int16_t, kTracks> efxaffiche{};
+    std::array<int16_t, kEffectSlots> autovar{};  // the mixer's auto-pan positions
+    std::atomic<MidiOut*> papi{nullptr};
+    SpscQueue<64> to_window;                  // from the audio thread
+    std::vector<Message> window_posts;        // from the window thread itself
+    const char* status = kStatusStopped;      // the status line
+    // Set by the audio driver while its callback may run: stopping then hands the voice
+    // reset to the audio thread instead of doing it here.
+    std::atomic<bool> audio_running{false};
+
+    // One half-tick of the sequencer.
+    void gere_play();
+    // Voice for the next note of track (polyphony by the track's nbvoice).
+    int track_to_poly(int track);
+    // Value of envelope kind (0..4, or 16) for voice, whose sample is length long.
+    float compute_adsr(int kind, unsigned voice, unsigned long length, const p_s* env) const;
+
+    // "PLAYING ALL" (pattern_mode false) or "PLAYING PATTERN".
+    void start(bool pattern_mode);
+    void stoppi(bool sound_only = false);
+    // Auditions: one cell on a track, one track of a position, one row.
+    void audition_note(const TNOTE& cell, int track);
+    void audition_track(int position, int track);
+    void play_line();
+    // Called by the audio thread before it renders a buffer: carries out a stop that
+    // the window thread asked for.
+    void service_audio_requests();
+
+    int ilestou(int position) const;  // pattern table index, -1 when none
+    int dopatend();                   // sets patend; returns the rows of the whole song
+    int fan(int column) const;
+    int fun(int track) const;
+    static int prochain(const TNOTE* column, int row, int rows);
+    void jump(int step, bool stay, bool control = false);
+
+private:
+    friend class EffectCommands;
+    void silence_voices();
+    void read_track(int track, int position, const Pattern* pattern, bool audition_cell);
+    void take_instrument(int track, Voice& v, const TNOTE& cell);
+    void set_start(Voice& v) const;
+    void trigger(int track, Voice& v, int note);
+    void send_program(int track, const Voice& v);
+    int route_to_slot(int track, int slot);
+
+    SongBank& bank_;
+    EffectSlots& slots_;
+    std::array<int16_t, kTracks> curvoice_{};  // voice each track's commands act on
+    int local_pos_ = 0;                       // the position while a call works on it
+    std::atomic<uint32_t> stop_request_{0};
+    std::atomic<uint32_t> stop_done_{0};
+};
+
+uint64_t system_time_us();
+
+}  // namespace ondrel
