@@ -1,5 +1,6 @@
 #pragma once
 #include "playback/player.h"
+#include "render/mixer.h"
 #include "song/alerts.h"
 #include "song/effect_slots.h"
 #include "song/song_bank.h"
@@ -11,7 +12,7 @@ namespace ondrel {
 class Engine {
 public:
     explicit Engine(AlertSink* alerts = nullptr)
-        : bank(alerts ? alerts : &alert_log), slots(), player(bank, slots) {}
+        : bank(alerts ? alerts : &alert_log), slots(), player(bank, slots), mixer(bank, slots, player) {}
     Engine(const Engine&) = delete;
     Engine& operator=(const Engine&) = delete;
 
@@ -19,6 +20,7 @@ public:
     SongBank bank;
     EffectSlots slots;
     Player player;
+    Mixer mixer;
 };
 
 }  // namespace ondrel

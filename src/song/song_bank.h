@@ -39,6 +39,8 @@ public:
     int16_t nbvoie = 0;
     // Set while a whole song is swapped in; the render callback then renders silence.
     std::atomic<uint8_t> loadin{0};
+    // The sample being replaced (local number), 65535 for none; voices on it are skipped.
+    std::atomic<uint16_t> loadininst{65535};
 
     void set_alerts(AlertSink* alerts) { alerts_ = alerts; }
     AlertSink* alerts() const { return alerts_; }

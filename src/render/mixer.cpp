@@ -1,0 +1,316 @@
+#include "render/mixer.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+
+#include "playback/tables.h"
+#include "render/pan_table.h"
+#include "render/voice_mix.h"
+
+namespace ondrel {
+
+namespace {
+constexpr float kStep = 0.0078125f;      // 1/128
+constexpr float kMasterStep = 0.015625f;  // 1/64
+enum Envelope { kEnvVolume = 1, kEnvSend = 2, kEnvPan = 4, kEnvPitch = 8, kEnvFade = 16 };
+}  // namespace
+
+Mixer::Mixer(SongBank& bank, EffectSlots& slots, Player& player)
+    : bank_(bank), slots_(slots), player_(player) {}
+
+double Mixer::tick_frames() const {
+    const int64_t t = bank_.current().tempo;
+    const int p = std::clamp<int>(valpitch.load(std::memory_order_relaxed), 1, 255);
+    int64_t scaled = t;
+    if (p < 128) scaled = t * 128 / p;
+    if (p > 128) scaled = (256 - p) * t / 128;
+    return static_cast<double>(scaled * 441) / 480000.0;
+}
+
+void Mixer::BufferProc(void*, void* buffer, unsigned long size, const AudioFormat& format) {
+    // Only interleaved stereo float is ours to render; anything else is left as given.
+    if (format.format != kFormatFloat || format.channel_count != 2 || !buffer) return;
+    float* out = static_cast<float*>(buffer);
+    int frames = static_cast<int>((size / 4) / 2);
+    // Send buffers and the recorder copy hold 4096 frames: longer buffers go in parts.
+    while (frames > 0) {
+        const int part = std::min(frames, kMaxFramesPerCall);
+        render_call(out, part, format);
+        out += 2 * part;
+        frames -= part;
+    }
+}
+
+void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
+    const uint64_t entry = system_time_us();
+    control_.fill(0);
+    compact_.fill(0);
+    written_.fill(0);
+    std::fill(out, out + 2 * frames, 0.0f);
+    nbpass.fetch_add(1, std::memory_order_relaxed);
+    player_.service_audio_requests();
+    if (bank_.loadin.load(std::memory_order_acquire)) return;
+
+    TMOD& m = bank_.current();
+    const double tick = tick_frames();
+    const double frame_rate = format.frame_rate > 0 ? format.frame_rate : kOutputRate;
+    int c = 0;
+    while (c < frames) {
+        int n;
+        if (ftemp.load(std::memory_order_relaxed)) {
+            if (bpmreste < 1.0) {
+                player_.gere_play();
+                n = static_cast<int>(tick + bpmreste);
+            } else {
+                n = static_cast<int>(bpmreste);
+            }
+            bpmreste = 0;
+            n = std::max(n, 1);  // a tick shorter than a frame still moves on
+            const int rest = frames - c;
+            if (n >= rest) {
+                bpmreste = n - rest;
+                n = rest;
+            }
+        } else {
+            player_.gere_play();
+            n = frames;
+        }
+        render_piece(out, c, n, m, frame_rate);
+        c += n;
+    }
+    effect_stage(out, frames, m);
+    output_stage(out, frames, format);
+
+    const double budget = std::trunc((frames * 8 * 0.125 / frame_rate) * 1000000.0);
+    if (budget > 0) powermusic.store(static_cast<float>((system_time_us() - entry) / budget), std::memory_order_relaxed);
+}
+
+void Mixer::number_routed_slots(const TMOD& m) {
+    control_.fill(0);
+    compact_.fill(0);
+    written_.fill(0);
+    int next = 0;
+    for (int t = 0; t < kTracks; ++t) {
+        const int s = m.tracke[t];
+        if (s > 0 && s < kEffectSlots && compact_[s] == 0) compact_[s] = static_cast<int16_t>(++next);
+    }
+}
+
+void Mixer::render_piece(float* out, int c0, int n, const TMOD& m, double frame_rate) {
+    number_routed_slots(m);
+    for (int vi = 0; vi < kVoices; ++vi)
+        if (player_.nlist[vi].active) render_voice(vi, out, c0, n, m, frame_rate);
+}
+
+void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, double frame_rate) {
+    Voice& v = player_.nlist[vi];
+    const int inst = v.instrument > 0 ? v.instrument - 1 : 0;
+    if (inst >= kSamplesPerSong || inst == bank_.loadininst.load(std::memory_order_relaxed)) return;
+    if (v.period < 2.0f) return;
+    const p_s* s = bank_.sample(m.sndbase + inst);
+    if (!s || !s->data) {
+        v.active = 0;
+        return;
+    }
+    const int track = std::clamp<int>(player_.polytotrack[vi], 0, kTracks - 1);
+    const int shift = std::clamp<int>(s->framecode, 0, 2);
+    const int64_t frames = s->length >> shift;
+    const bool loop = s->loopon != 0;
+    const int64_t loop_start = s->loopstart >> shift;
+    int64_t end = v.endpos ? v.endpos : frames;
+    if (loop) end = s->loopend >> shift;
+    end = std::min(end, frames);
+    const uint16_t env = s->flagword;
+    const bool released = v.keyoff != 0;
+
+    // Step.
+    const int pitch = std::clamp<int>(valpitch.load(std::memory_order_relaxed), 1, 255);
+    double step = (floatnote()[std::clamp<int>(s->refnote, 0, 127)] / v.period) * (s->rate / frame_rate);
+    if (pitch > 128) step *= 1 + (pitch - 128) * 0.0078125;
+    if (pitch < 128) step *= 2.0 - 128.0 / pitch;
+    if (env & kEnvPitch) {
+        const float e = player_.compute_adsr(3, vi, static_cast<unsigned long>(frames), s);
+        if (e != 64.0f) step *= std::pow(1.059463094, (e - 64) * 0.015625);
+    }
+    step = std::max(step, 0.0);  // below pitch 64 voices stand still rather than run back
+
+    // Gains.
+    float g = 1.0f;
+    if (released && (env & kEnvFade)) {
+        const float fade = player_.compute_adsr(4, vi, s->setting, s);
+        if (fade == -1.0f) {
+            v.active = 0;
+            return;
+        }
+        g = fade;
+    }
+    if (env & kEnvVolume) g *= player_.compute_adsr(0, vi, static_cast<unsigned long>(frames), s);
+    g *= v.volume * kStep;
+    int pan = m.trackvol[track];
+    if (env & kEnvPan) pan = static_cast<int>(player_.compute_adsr(2, vi, static_cast<unsigned long>(frames), s));
+    pan = std::clamp(pan, 0, 127);
+    float gl = g * tab_pan()[pan];
+    float gr = g * tab_pan()[127 - pan];
+    switch (m.mode) {
+        case 1:  // Amiga: voices 0 and 3 right, 1 and 2 left
+            if (vi % 4 == 0 || vi % 4 == 3) gl = 0; else gr = 0;
+            break;
+        case 3:  // L&R: even voices right, odd voices left
+            if (vi % 2 == 0) gl = 0; else gr = 0;
+            break;
+        default: break;
+    }
+    const float master = m.globalvol * kMasterStep;
+    gl *= m.trackpan[track] * kStep * master;
+    gr *= m.trackpan2[track] * kStep * master;
+
+    float* send = nullptr;
+    float send_level = 0;
+    const int slot = m.tracke[track];
+    const int k = slot > 0 && slot < kEffectSlots ? compact_[slot] : 0;
+    if (k > 0 && k <= slots_.nsendbuffers.load(std::memory_order_acquire)) {
+        const float e1 = (env & kEnvSend) ? player_.compute_adsr(1, vi, static_cast<unsigned long>(frames), s)
+                                          : static_cast<float>(m.trackc[track]);
+        control_[slot] = static_cast<int16_t>(e1);
+        send = slots_.pbufferefx[k - 1].get() + c0;
+        send_level = e1 * kStep;
+        switch (slots_.efxtype[slot]) {
+            case 1: case 2: case 3: case 16: case 17:  // heard only through the filter
+                send_level = m.trackpan[track] * kStep;
+                gl = gr = 0;
+                break;
+            case 5: send_level = m.trackpan[track] * kStep; break;
+            case 12:
+                send_level = m.trackpan[track] * kStep * 0.4f;
+                gl *= 0.4f;
+                gr *= 0.4f;
+                break;
+            default: break;
+        }
+    }
+    const float q = s->bits == 8 ? 0.0078125f : 3.0517578e-05f;
+    const MixGains gains{q * gl, q * gr, q * (send_level * master * g)};
+    const bool interpolate = qual.load(std::memory_order_relaxed) == 1 || (s->flag2 & 1);
+    const bool muted = mute[track].load(std::memory_order_relaxed) != 0;
+    const bool stereo = s->stereo != 0;
+    const bool bits16 = s->bits == 16;
+
+    int64_t pos = v.position;
+    double f = v.fraction;
+    int m_left = n;
+    float* o = out + 2 * c0;
+    for (;;) {
+        const int64_t adv = static_cast<int64_t>(step * m_left + f);
+        if (pos >= end) {
+            pos = loop_start;
+            v.position = static_cast<uint32_t>(pos);
+        }
+        auto frames_until_end = [&]() -> int64_t {
+            if (pos + adv < end) return m_left;
+            if (step <= 0) return pos < end ? m_left : 0;
+            return static_cast<int64_t>(((end - pos) - f) / step);
+        };
+        int64_t count = frames_until_end();
+        if (count < 1) {
+            if (!loop) {
+                v.active = 0;
+                return;
+            }
+            if (count == 0) {
+                pos = loop_start;
+                v.position = static_cast<uint32_t>(pos);
+                count = frames_until_end();
+            }
+            if (count < 1) return;  // frozen for this piece
+        }
+        const int cnt = static_cast<int>(count);
+        double x = f;
+        if (muted) {
+            x += step * cnt;
+        } else if (stereo) {
+            x = stereo_mixer(bits16)(s->data, pos, x, step, cnt, o, gains);
+        } else {
+            const SendMode mode = !send ? SendMode::None : written_[k] ? SendMode::Add : SendMode::First;
+            x = mono_mixer(bits16, interpolate, mode)(s->data, pos, x, step, cnt, o, send, gains);
+            if (send) written_[k] = 1;
+        }
+        pos += static_cast<int64_t>(x);
+        f = x - std::floor(x);
+        o += 2 * cnt;
+        if (send) send += cnt;
+        if (released && (env & kEnvFade)) v.count1 += static_cast<uint32_t>(adv);
+        if (m_left - cnt != 0 && loop && s->loopend > s->loopstart) {
+            m_left -= cnt;
+            pos = loop_start;
+            continue;
+        }
+        if (end <= pos && !loop) v.active = 0;
+        break;
+    }
+    v.position = static_cast<uint32_t>(pos);
+    v.fraction = static_cast<float>(f);
+}
+
+void Mixer::effect_stage(float* out, int frames, TMOD& m) {
+    pass.fetch_add(1, std::memory_order_relaxed);
+    if (units_) units_->begin_buffer();
+    const int ready = slots_.nsendbuffers.load(std::memory_order_acquire);
+    const auto& pan = tab_pan();
+    for (int s = 0; s < kEffectSlots; ++s) {
+        const int k = compact_[s];
+        if (k == 0 || k > ready) continue;
+        float* send = slots_.pbufferefx[k - 1].get();
+        if (!written_[k]) std::fill(send, send + std::min(2 * frames, kSendBufferFloats), 0.0f);
+        float el = 1.0f, er = 1.0f;
+        if (m.efxflag[s]) {
+            int16_t& a = player_.autovar[s];
+            const int p = std::clamp(a >> 1, 0, 127);
+            el = pan[p];
+            er = pan[127 - p];
+            a = static_cast<int16_t>(a + m.efxc[s]);
+            if (a > m.efxb[s]) {
+                a = m.efxb[s];
+                m.efxc[s] = static_cast<int16_t>(-m.efxc[s]);
+            }
+            if (a < m.efxa[s]) {
+                a = m.efxa[s];
+                m.efxc[s] = static_cast<int16_t>(-m.efxc[s]);
+            }
+        }
+        if (units_) units_->run(s, slots_.efxtype[s], send, out, frames, control_[s], el, er);
+    }
+}
+
+void Mixer::output_stage(float* out, int frames, const AudioFormat& format) {
+    float lpeak = 0, rpeak = 0;
+    for (int i = 0; i < frames; ++i) {
+        const float l = std::clamp(out[2 * i] * 0.25f, -1.0f, 1.0f);
+        const float r = std::clamp(out[2 * i + 1] * 0.25f, -1.0f, 1.0f);
+        out[2 * i] = l;
+        out[2 * i + 1] = r;
+        lpeak = std::max(lpeak, std::fabs(l));
+        rpeak = std::max(rpeak, std::fabs(r));
+    }
+    lmax.store(lpeak, std::memory_order_relaxed);
+    rmax.store(rpeak, std::memory_order_relaxed);
+    if (f_fftmode.load(std::memory_order_relaxed) == 1)
+        for (int i = 0; i < std::min(frames, 512); ++i)
+            Bufferfft1[i].store(static_cast<double>(out[2 * i + 1] * 0.5f + out[2 * i] * 0.5f), std::memory_order_relaxed);
+    if (record_to_file.load(std::memory_order_relaxed) && frecmusic.load(std::memory_order_relaxed) && recorder_) {
+        for (int i = 0; i < 2 * frames; ++i) bufferrecmusic_[i] = static_cast<int16_t>(out[i] * 32767);
+        recorder_->RecordFile(bufferrecmusic_.data(), static_cast<size_t>(4 * frames), format);
+    }
+    if (monitor.load(std::memory_order_relaxed) && !frecmusic.load(std::memory_order_relaxed) && monitor_ring_) {
+        // Added after the clip and the meters: the monitored input is neither.
+        MonitorRing& ring = *monitor_ring_;
+        constexpr size_t kValues = MonitorRing::kBytes / 2;
+        for (int i = 0; i < frames; ++i) {
+            out[2 * i] += ring.ring[ring.read % kValues].load(std::memory_order_relaxed) / 32768.0f;
+            out[2 * i + 1] += ring.ring[(ring.read + 1) % kValues].load(std::memory_order_relaxed) / 32768.0f;
+            ring.read = (ring.read + 2) % kValues;
+        }
+    }
+}
+
+}  // namespace ondrel

@@ -1,0 +1,76 @@
+#pragma once
+#include <array>
+#include <atomic>
+#include <cstdint>
+
+#include "playback/player.h"
+#include "render/audio_format.h"
+#include "render/effect_processor.h"
+#include "render/output_taps.h"
+#include "song/effect_slots.h"
+#include "song/song_bank.h"
+
+namespace ondrel {
+
+inline constexpr int kMaxFramesPerCall = 4096;  // larger buffers are rendered in such parts
+
+// The render callback and the mixer's options and meters. BufferProc runs on the audio
+// thread; the options are set from the window thread.
+class Mixer {
+public:
+    Mixer(SongBank& bank, EffectSlots& slots, Player& player);
+
+    // Options ("Tempo", "Sound Quality", global pitch, mute) and the analyser switch.
+    std::atomic<uint8_t> ftemp{1};
+    std::atomic<int16_t> qual{0};
+    std::atomic<int16_t> valpitch{128};
+    std::array<std::atomic<uint8_t>, kTracks> mute{};
+    std::atomic<int16_t> f_fftmode{0};
+    std::atomic<uint8_t> frecmusic{0};
+    std::atomic<uint8_t> record_to_file{0};
+    std::atomic<uint8_t> monitor{0};
+
+    // Meters and counters, read by the window thread.
+    std::atomic<float> lmax{0};
+    std::atomic<float> rmax{0};
+    std::atomic<float> powermusic{0};
+    std::atomic<uint32_t> nbpass{0};
+    std::atomic<uint32_t> pass{0};
+    std::array<std::atomic<double>, 512> Bufferfft1{};
+
+    double bpmreste = 0;  // frames of the current tick still owed; audio thread only
+
+    void set_effects(EffectProcessor* units) { units_ = units; }
+    void set_recorder(OutputRecorder* recorder) { recorder_ = recorder; }
+    void set_monitor(MonitorRing* ring) { monitor_ring_ = ring; }
+
+    // The callback: fills size bytes of interleaved stereo float at buffer.
+    void BufferProc(void* cookie, void* buffer, unsigned long size, const AudioFormat& format);
+
+    // The tick length in frames for the song's tempo and the global pitch.
+    double tick_frames() const;
+
+private:
+    void render_call(float* out, int frames, const AudioFormat& format);
+    void number_routed_slots(const TMOD& m);
+    void render_piece(float* out, int c0, int n, const TMOD& m, double frame_rate);
+    void render_voice(int vi, float* out, int c0, int n, const TMOD& m, double frame_rate);
+    void effect_stage(float* out, int frames, TMOD& m);
+    void output_stage(float* out, int frames, const AudioFormat& format);
+
+    SongBank& bank_;
+    EffectSlots& slots_;
+    Player& player_;
+    EffectProcessor* units_ = nullptr;
+    OutputRecorder* recorder_ = nullptr;
+    MonitorRing* monitor_ring_ = nullptr;
+
+    // Per piece: the control value of each slot, its compact number, and whether a voice
+    // has written its send buffer yet.
+    std::array<int16_t, kEffectSlots> control_{};
+    std::array<int16_t, kEffectSlots> compact_{};
+    std::array<uint8_t, kEffectSlots> written_{};
+    std::array<int16_t, 8192> bufferrecmusic_{};
+};
+
+}  // namespace ondrel

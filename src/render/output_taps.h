@@ -1,0 +1,27 @@
+#pragma once
+#include <array>
+#include <atomic>
+#include <cstddef>
+#include <cstdint>
+
+#include "render/audio_format.h"
+
+namespace ondrel {
+
+// Where the mixer hands a 16-bit copy of its output while the song is recorded.
+class OutputRecorder {
+public:
+    virtual ~OutputRecorder() = default;
+    // Called on the audio thread: must not block, allocate or do I/O.
+    virtual void RecordFile(const int16_t* samples, size_t bytes, const AudioFormat& format) = 0;
+};
+
+// The monitored input: a ring of 16384 bytes of 16-bit stereo frames filled by the capture
+// side and read by the mixer at its own pace.
+struct MonitorRing {
+    static constexpr size_t kBytes = 16384;
+    std::array<std::atomic<int16_t>, kBytes / 2> ring{};
+    size_t read = 0;  // in 16-bit values; the mixer's own
+};
+
+}  // namespace ondrel

@@ -1,0 +1,30 @@
+#pragma once
+// The inner loops of the mixer, one instance per case (sample width, interpolation,
+// send mode, stereo) so that no test is made per frame.
+#include <cstdint>
+
+namespace ondrel {
+
+typedef int16_t __attribute__((may_alias)) sample16_t;  // sample data lives in a byte block
+
+enum class SendMode { None, First, Add };
+
+struct MixGains {
+    float left;
+    float right;
+    float send;
+};
+
+// Mixes count frames of a mono sample starting at frame pos, offset x (grows by step),
+// into interleaved out and the mono send buffer; returns the final x.
+using MonoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count,
+                             float* out, float* send, const MixGains& g);
+// Stereo samples are never interpolated and never sent.
+using StereoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count,
+                               float* out, const MixGains& g);
+
+// The loop for a case; bits16 selects 16-bit data.
+MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send);
+StereoMixFn stereo_mixer(bool bits16);
+
+}  // namespace ondrel

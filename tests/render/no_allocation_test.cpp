@@ -1,0 +1,68 @@
+// The render callback must not allocate: every allocation in this program is counted
+// while a flag is up.
+#include <atomic>
+#include <cstdlib>
+#include <new>
+
+#include "mixer_fixture.h"
+
+// Replacing the global operators on purpose; GCC cannot see that both sides use malloc.
+#pragma GCC diagnostic ignored "-Wmismatched-new-delete"
+
+namespace {
+std::atomic<bool> counting{false};
+std::atomic<int> allocations{0};
+}  // namespace
+
+void* operator new(std::size_t n) {
+    if (counting.load(std::memory_order_relaxed)) allocations.fetch_add(1, std::memory_order_relaxed);
+    if (void* p = std::malloc(n ? n : 1)) return p;
+    throw std::bad_alloc();
+}
+void* operator new[](std::size_t n) { return operator new(n); }
+void operator delete(void* p) noexcept { std::free(p); }
+void operator delete[](void* p) noexcept { std::free(p); }
+void operator delete(void* p, std::size_t) noexcept { std::free(p); }
+void operator delete[](void* p, std::size_t) noexcept { std::free(p); }
+
+namespace ondrel {
+namespace {
+
+using NoAllocation = test::MixerFixture;
+
+TEST_F(NoAllocation, BufferProcAllocatesNothingWhilePlaying) {
+    // A song that uses every path: several tracks, a loop, sends, envelopes, commands.
+    TMOD& m = song();
+    m.nbtrack = 4;
+    engine.bank.nbvoie = 4;
+    engine.slots.reserve_send_buffers(3);
+    m.tracke[1] = 11;
+    m.tracke[2] = 16;
+    m.efxflag[11] = 1;
+    p_s& a = sample8(1, std::vector<int8_t>(5000, 40));
+    a.loopon = 1;
+    a.loopstart = 1000;
+    a.loopend = 5000;
+    a.flagword = 31;
+    a.flag2 = 1;
+    sample16(2, std::vector<int16_t>(3000, 1000), true);
+    Pattern* p = engine.bank.song_pattern(0);
+    for (int r = 0; r < 64; r += 2) {
+        p->col[0][r] = {48, 0, 0, 1, 4, 0x44};
+        p->col[1][r] = {60, 64, 0, 1, 33, 11};
+        p->col[2][r] = {55, 0, 0, 2, 0, 0x37};
+        p->col[3][r + 1] = {0x80, 0, 0, 0, 10, 0x02};
+    }
+    player.start(false);
+    std::vector<float> out(2 * 1024);
+    mixer.BufferProc(nullptr, out.data(), out.size() * 4, AudioFormat{});  // warm up
+    counting = true;
+    for (int i = 0; i < 300; ++i) mixer.BufferProc(nullptr, out.data(), out.size() * 4, AudioFormat{});
+    counting = false;
+    EXPECT_EQ(allocations.load(), 0);
+    EXPECT_GT(mixer.nbpass.load(), 300u);
+    EXPECT_GT(mixer.lmax.load(), 0.0f);  // it did play
+}
+
+}  // namespace
+}  // namespace ondrel
