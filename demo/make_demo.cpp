@@ -111,10 +111,10 @@ void note(Engine& e, int pattern, int row, int track, int n, int instrument, int
 }
 
 void drums(Engine& e, int p, bool full) {
-    for (int r = 0; r < 64; r += 8) note(e, p, r, 0, 60, 1);
-    if (full) note(e, p, 58, 0, 60, 1, 80);
-    for (int r = 4; r < 64; r += 8) note(e, p, r, 1, 60, 2);
-    if (full) note(e, p, 62, 1, 60, 2, 60);
+    for (int r = 0; r < 64; r += 8) note(e, p, r, 0, 72, 1);
+    if (full) note(e, p, 58, 0, 72, 1, 80);
+    for (int r = 4; r < 64; r += 8) note(e, p, r, 1, 72, 2);
+    if (full) note(e, p, 62, 1, 74, 2, 60);
     for (int r = 0; r < 64; r += 2) note(e, p, r, 2, 72, 3, r % 4 ? 40 : 0, 14, 0xC2);
 }
 
@@ -134,6 +134,7 @@ void build_patterns(Engine& e) {
     m.speed = 6;
     m.tempo = 60000000 / 125;
     m.format = 2;
+    m.globalvol = 96;
     const int seq[] = {0, 1, 2, 1, 2, 3};
     m.nbpos = sizeof seq / sizeof seq[0];
     for (int i = 0; i < m.nbpos; ++i) m.sequence[i] = static_cast<uint8_t>(seq[i]);

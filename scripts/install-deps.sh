@@ -6,6 +6,7 @@ set -euo pipefail
 packages=(
   build-essential cmake pkg-config python3
   libgtest-dev zlib1g-dev
+  libsdl2-dev
 )
 
 missing=()

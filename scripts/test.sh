@@ -5,10 +5,10 @@ cd "$(dirname "$0")/.."
 scripts/install-deps.sh
 
 echo "== build and test"
-scripts/build.sh build -DONDREL_WERROR=ON
+scripts/build.sh build -DONDREL_TESTS=ON -DONDREL_WERROR=ON
 (cd build && ctest --output-on-failure -j "$(nproc)")
 
 echo "== build and test under ASan+UBSan"
-BUILD_TYPE=Debug scripts/build.sh build-asan -DONDREL_SANITIZE=address -DONDREL_WERROR=ON
+BUILD_TYPE=Debug scripts/build.sh build-asan -DONDREL_TESTS=ON -DONDREL_SANITIZE=address -DONDREL_WERROR=ON
 (cd build-asan && ASAN_OPTIONS=detect_leaks=1:abort_on_error=1 UBSAN_OPTIONS=print_stacktrace=1 \
    ctest --output-on-failure -j "$(nproc)")

@@ -1,30 +1,13 @@
 #include <cstdio>
 #include <iostream>
 
+#include "cli/cli_load.h"
 #include "cli/commands.h"
 #include "cli/song_report.h"
 #include "engine/engine.h"
 #include "export/otm_writer.h"
-#include "import/loader.h"
 
 namespace ondrel {
-
-namespace {
-
-// Loads path into engine's current song; prints why on failure.
-bool load_for_cli(Engine& engine, const std::string& path) {
-    const LoadResult r = load(path, engine.bank, engine.slots);
-    if (!r.ok) {
-        std::cerr << "ondrel: " << r.error << "\n";
-        return false;
-    }
-    if (r.truncated)
-        std::cerr << "ondrel: warning: " << path << " ends early; what was read is kept\n";
-    for (const auto& note : r.notes) std::cerr << "ondrel: " << path << ": " << note << "\n";
-    return true;
-}
-
-}  // namespace
 
 int cmd_info(const Args& args) {
     bool json = false;

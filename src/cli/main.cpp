@@ -12,6 +12,9 @@ struct Command {
 };
 
 const Command kCommands[] = {
+    {"play", "play FILE [OPTIONS]     play a song on the sound card, with a status line", ondrel::cmd_play},
+    {"render", "render FILE -o OUT     render a song to a WAV file, faster than real time",
+     ondrel::cmd_render},
     {"info", "info [--json] FILE     show a module: tempo, sequence, patterns, samples, effects",
      ondrel::cmd_info},
     {"convert", "convert FILE -o OUT    save any module the program reads as a .otm module",
@@ -24,7 +27,8 @@ void usage(std::ostream& out) {
            "commands:\n";
     for (const auto& c : kCommands) out << "  " << c.summary << "\n";
     out << "\n'ondrel COMMAND --help' tells more about one command.\n"
-           "Exit status: 0 done, 1 the file or device failed, 2 the command line was wrong.\n";
+           "Exit status: 0 done, 1 a file could not be read or written, 2 the command line was\n"
+           "wrong, 3 no sound device could be opened.\n";
 }
 
 }  // namespace

@@ -56,6 +56,12 @@ public:
     // the window thread asked for.
     void service_audio_requests();
 
+    // Remembers the rows played from now on, so that a song that comes back to a row it
+    // has played (a loop by jump) can be told apart from one still going; repeated is
+    // raised at the first such row.
+    void watch_for_repeats(bool on);
+    std::atomic<bool> repeated{false};
+
     int ilestou(int position) const;  // pattern table index, -1 when none
     int dopatend();                   // sets patend; returns the rows of the whole song
     int fan(int column) const;
@@ -77,6 +83,8 @@ private:
     EffectSlots& slots_;
     std::array<int16_t, kTracks> curvoice_{};  // voice each track's commands act on
     int local_pos_ = 0;                       // the position while a call works on it
+    std::vector<uint64_t> visited_;           // a bit per position and row when watched
+    void mark_visited();
     std::atomic<uint32_t> stop_request_{0};
     std::atomic<uint32_t> stop_done_{0};
 };

@@ -93,6 +93,64 @@ with tempfile.TemporaryDirectory() as tmp:
     check("truncated warning", "ends early" in r.stderr, r.stderr)
     check("truncated keeps the head", json.loads(r.stdout)["name"] == "Ondrel Morning")
 
+# Offline render, read back with an independent WAV reader.
+import array
+import math
+import wave
+
+with tempfile.TemporaryDirectory() as tmp:
+    out = os.path.join(tmp, "demo.wav")
+    r = run("render", DEMO, "-o", out)
+    check("render exit", r.returncode == 0, r.stderr)
+    check("render says where it stopped", "end of the song" in r.stderr, r.stderr)
+    with wave.open(out) as w:
+        check("wav stereo", w.getnchannels() == 2)
+        check("wav rate", w.getframerate() == 44100)
+        check("wav 16-bit", w.getsampwidth() == 2)
+        seconds = w.getnframes() / 44100
+        # 6 positions of 64 rows at 125 BPM, speed 6 (the last rows at 100 BPM).
+        check("demo length", 44 < seconds < 50, seconds)
+        pcm = array.array("h", w.readframes(w.getnframes()))
+    peak = max(abs(x) for x in pcm) / 32767
+    rms = math.sqrt(sum(x * x for x in pcm[::7]) / len(pcm[::7])) / 32767
+    check("demo is heard", rms > 0.02, rms)
+    check("demo does not clip", peak < 0.99, peak)
+    left, right = pcm[0::2], pcm[1::2]
+    check("demo is stereo", any(a != b for a, b in zip(left[44100:88200], right[44100:88200])))
+
+    short = os.path.join(tmp, "short.wav")
+    r = run("render", DEMO, "-o", short, "--max-seconds", "1.5", "--float", "--quality", "interpolation")
+    check("limited render", r.returncode == 0, r.stderr)
+    with open(short, "rb") as f:
+        head = f.read(64)
+    check("float wav format tag", head[20:22] == b"\x03\x00", head[:40])
+    check("float wav length", os.path.getsize(short) == 58 + 66150 * 8, os.path.getsize(short))
+
+    check("render without -o", run("render", DEMO).returncode == 2)
+    check("render bad option value", run("render", DEMO, "-o", short, "--pitch", "500").returncode == 2)
+    missing_dir = os.path.join(tmp, "no", "such", "dir", "x.wav")
+    r = run("render", DEMO, "-o", missing_dir)
+    check("render to a missing folder", r.returncode == 1 and r.stderr.startswith("ondrel: "), r.stderr)
+
+    # Live play through SDL's dummy and disk drivers (no sound card needed).
+    env = dict(os.environ, SDL_AUDIODRIVER="dummy")
+    r = subprocess.run([ONDREL, "play", DEMO, "--max-seconds", "1"], capture_output=True, text=True,
+                       timeout=30, env=env, stdin=subprocess.DEVNULL)
+    check("play on the dummy driver", r.returncode == 0 and "time limit" in r.stderr, r.stderr)
+    raw = os.path.join(tmp, "out.raw")
+    env = dict(os.environ, SDL_AUDIODRIVER="disk", SDL_DISKAUDIOFILE=raw)
+    r = subprocess.run([ONDREL, "play", DEMO, "--max-seconds", "1"], capture_output=True, text=True,
+                       timeout=30, env=env, stdin=subprocess.DEVNULL)
+    check("play on the disk driver", r.returncode == 0, r.stderr)
+    samples = array.array("f", open(raw, "rb").read()) if os.path.exists(raw) else array.array("f")
+    check("the disk driver heard the song", len(samples) > 44100 and max(map(abs, samples)) > 0.05,
+          len(samples))
+    env = dict(os.environ, SDL_AUDIODRIVER="nosuchdriver")
+    r = subprocess.run([ONDREL, "play", DEMO], capture_output=True, text=True, timeout=30, env=env,
+                       stdin=subprocess.DEVNULL)
+    check("no device exits 3", r.returncode == 3, (r.returncode, r.stderr))
+    check("no device says render", "render" in r.stderr and r.stderr.count("\n") == 1, r.stderr)
+
 # Usage errors exit 2; help exits 0.
 check("no command", run().returncode == 2)
 check("unknown command", run("frobnicate").returncode == 2)

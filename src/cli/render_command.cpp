@@ -1,0 +1,107 @@
+#include <algorithm>
+#include <chrono>
+#include <cstdio>
+#include <iostream>
+
+#include "cli/cli_load.h"
+#include "cli/commands.h"
+#include "cli/sound_options.h"
+#include "export/wav_writer.h"
+#include "render/offline_render.h"
+
+namespace ondrel {
+
+namespace {
+
+void render_usage(std::ostream& out) {
+    out << "usage: ondrel render FILE -o OUT.wav [options]\n"
+           "Renders the song offline, faster than real time, to a 44100 Hz stereo WAV file.\n"
+           "It stops at the song's end, when the song comes back to a row it has already\n"
+           "played, or at --max-seconds. OUT is replaced only once it is complete.\n\n"
+           "  -o OUT.wav           the file to write\n"
+           "  --float              32-bit float samples instead of 16-bit\n"
+           "  --quiet              no progress bar\n"
+        << sound_options_help();
+}
+
+void show_progress(const Player& player, const TMOD& song, double seconds) {
+    const int positions = std::max<int>(song.nbpos, 1);
+    const int at = std::min<int>(player.tr.nopat, positions);
+    const int width = 30;
+    const int filled = at * width / positions;
+    std::fprintf(stderr, "\r[%.*s%.*s] position %3d/%-3d %3d:%02d rendered", filled,
+                 "##############################", width - filled, "..............................", at,
+                 positions, static_cast<int>(seconds) / 60, static_cast<int>(seconds) % 60);
+    std::fflush(stderr);
+}
+
+}  // namespace
+
+int cmd_render(const Args& args) {
+    std::string in, out, error;
+    bool as_float = false, quiet = false;
+    SoundOptions sound;
+    for (size_t i = 0; i < args.size() && error.empty(); ++i) {
+        const std::string& a = args[i];
+        if (a == "-h" || a == "--help") {
+            render_usage(std::cout);
+            return kExitOk;
+        } else if (a == "-o" && i + 1 < args.size()) {
+            out = args[++i];
+        } else if (a == "--float") {
+            as_float = true;
+        } else if (a == "--quiet") {
+            quiet = true;
+        } else if (parse_sound_option(args, i, sound, error)) {
+        } else if (!a.empty() && a[0] != '-' && in.empty()) {
+            in = a;
+        } else {
+            error = "unexpected " + a;
+        }
+    }
+    if (error.empty() && (in.empty() || out.empty())) error = "a song and -o OUT.wav are needed";
+    if (!error.empty()) {
+        std::cerr << "ondrel render: " << error << "\n";
+        render_usage(std::cerr);
+        return kExitUsage;
+    }
+
+    Engine engine;
+    if (!load_for_cli(engine, in)) return kExitFailed;
+    apply_sound_options(sound, engine);
+    WavWriter wav;
+    std::string why;
+    if (!wav.open(out, 2, 44100, as_float ? WavSampleFormat::Float32 : WavSampleFormat::Pcm16, why)) {
+        std::cerr << "ondrel: " << why << "\n";
+        return kExitFailed;
+    }
+    const bool progress = !quiet && is_terminal(2);
+    const auto started = std::chrono::steady_clock::now();
+    auto last_shown = started;
+    const TMOD& song = engine.bank.current();
+    const RenderEnd end = render_offline(
+        engine.mixer, engine.player, OfflineOptions{sound.buffer_frames, sound.max_seconds},
+        [&](const float* frames, int count, double seconds) {
+            if (!wav.write(frames, static_cast<size_t>(count))) return false;
+            const auto now = std::chrono::steady_clock::now();
+            if (progress && now - last_shown > std::chrono::milliseconds(100)) {
+                show_progress(engine.player, song, seconds);
+                last_shown = now;
+            }
+            return true;
+        });
+    if (progress) std::fprintf(stderr, "\r%70s\r", "");
+    if (end == RenderEnd::Aborted || !wav.finish(why)) {
+        std::cerr << "ondrel: " << (why.empty() ? "cannot write " + out : why) << "\n";
+        wav.abandon();
+        return kExitFailed;
+    }
+    const double seconds = static_cast<double>(wav.frames_written()) / 44100.0;
+    const double took = std::chrono::duration<double>(std::chrono::steady_clock::now() - started).count();
+    if (!quiet)
+        std::fprintf(stderr, "wrote %s: %.1f s of sound in %.2f s (%.0fx real time); stopped at the %s\n",
+                     out.c_str(), seconds, took, took > 0 ? seconds / took : 0.0, render_end_text(end));
+    return kExitOk;
+}
+
+}  // namespace ondrel

@@ -1,0 +1,138 @@
+#include "export/wav_writer.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+#include <vector>
+
+namespace ondrel {
+
+int wav_sample_bytes(WavSampleFormat format) {
+    switch (format) {
+        case WavSampleFormat::Pcm8: return 1;
+        case WavSampleFormat::Pcm16: return 2;
+        case WavSampleFormat::Float32: return 4;
+    }
+    return 2;
+}
+
+bool WavWriter::open(const std::string& path, int channels, int rate, WavSampleFormat format, std::string& why) {
+    if (!file_.open(path, why)) return false;
+    channels_ = channels;
+    rate_ = rate;
+    format_ = format;
+    frames_ = 0;
+    failed_ = false;
+    return write_header(0);
+}
+
+bool WavWriter::put(const void* data, size_t bytes) {
+    if (failed_ || !file_.stream()) return false;
+    if (std::fwrite(data, 1, bytes, file_.stream()) != bytes) failed_ = true;
+    return !failed_;
+}
+
+namespace {
+void le16(std::vector<uint8_t>& b, uint32_t v) {
+    b.push_back(static_cast<uint8_t>(v));
+    b.push_back(static_cast<uint8_t>(v >> 8));
+}
+void le32(std::vector<uint8_t>& b, uint32_t v) {
+    le16(b, v & 0xffff);
+    le16(b, v >> 16);
+}
+void tag(std::vector<uint8_t>& b, const char* t) { b.insert(b.end(), t, t + 4); }
+}  // namespace
+
+bool WavWriter::write_header(uint32_t data_bytes) {
+    const bool is_float = format_ == WavSampleFormat::Float32;
+    const uint32_t bytes = static_cast<uint32_t>(wav_sample_bytes(format_));
+    const uint32_t fmt_size = is_float ? 18 : 16;
+    std::vector<uint8_t> h;
+    tag(h, "RIFF");
+    le32(h, 4 + (8 + fmt_size) + (is_float ? 12 : 0) + 8 + data_bytes + (data_bytes & 1));
+    tag(h, "WAVE");
+    tag(h, "fmt ");
+    le32(h, fmt_size);
+    le16(h, is_float ? 3 : 1);
+    le16(h, static_cast<uint32_t>(channels_));
+    le32(h, static_cast<uint32_t>(rate_));
+    le32(h, static_cast<uint32_t>(rate_) * static_cast<uint32_t>(channels_) * bytes);
+    le16(h, static_cast<uint32_t>(channels_) * bytes);
+    le16(h, bytes * 8);
+    if (is_float) {
+        le16(h, 0);
+        tag(h, "fact");
+        le32(h, 4);
+        le32(h, static_cast<uint32_t>(frames_));
+    }
+    tag(h, "data");
+    le32(h, data_bytes);
+    return put(h.data(), h.size());
+}
+
+bool WavWriter::write(const float* samples, size_t frames) {
+    const size_t n = frames * static_cast<size_t>(channels_);
+    uint8_t buffer[4096];
+    const size_t per = static_cast<size_t>(wav_sample_bytes(format_));
+    size_t done = 0;
+    while (done < n) {
+        const size_t chunk = std::min(n - done, sizeof buffer / per);
+        for (size_t i = 0; i < chunk; ++i) {
+            const float x = std::clamp(samples[done + i], -1.0f, 1.0f);
+            switch (format_) {
+                case WavSampleFormat::Pcm8:
+                    buffer[i] = static_cast<uint8_t>(std::lround(x * 127.0f) + 128);
+                    break;
+                case WavSampleFormat::Pcm16: {
+                    const int16_t v = static_cast<int16_t>(std::lround(x * 32767.0f));
+                    buffer[2 * i] = static_cast<uint8_t>(v & 0xff);
+                    buffer[2 * i + 1] = static_cast<uint8_t>((v >> 8) & 0xff);
+                    break;
+                }
+                case WavSampleFormat::Float32: std::memcpy(buffer + 4 * i, &x, 4); break;
+            }
+        }
+        if (!put(buffer, chunk * per)) return false;
+        done += chunk;
+    }
+    frames_ += frames;
+    return true;
+}
+
+bool WavWriter::write_pcm16(const int16_t* samples, size_t frames) {
+    const size_t n = frames * static_cast<size_t>(channels_);
+    std::vector<uint8_t> bytes(2 * n);
+    for (size_t i = 0; i < n; ++i) {
+        bytes[2 * i] = static_cast<uint8_t>(samples[i] & 0xff);
+        bytes[2 * i + 1] = static_cast<uint8_t>((samples[i] >> 8) & 0xff);
+    }
+    if (!put(bytes.data(), bytes.size())) return false;
+    frames_ += frames;
+    return true;
+}
+
+bool WavWriter::finish(std::string& why) {
+    if (!file_.stream()) {
+        why = "nothing to finish";
+        return false;
+    }
+    const uint64_t data_bytes = frames_ * static_cast<uint64_t>(channels_) * wav_sample_bytes(format_);
+    if (data_bytes > 0xFFFFFFF0ull) {
+        why = "the sound is too long for a WAV file";
+        abandon();
+        return false;
+    }
+    if (data_bytes & 1) put("", 1);
+    if (!failed_ && std::fseek(file_.stream(), 0, SEEK_SET) == 0) write_header(static_cast<uint32_t>(data_bytes));
+    if (failed_) {
+        why = "cannot write the sound file";
+        abandon();
+        return false;
+    }
+    return file_.commit(why);
+}
+
+void WavWriter::abandon() { file_.abandon(); }
+
+}  // namespace ondrel
