@@ -93,8 +93,9 @@ void make_samples(Engine& e) {
     p_s& pad = add_sample(e, 5, "pad", pad_frames, 64);
     for (uint32_t i = 0; i < pad_frames; ++i) {
         const double x = i / double(kCycle);
-        put(pad, i, (std::sin(kTwoPi * x) + std::sin(kTwoPi * x * 1.0035) * 0.8 +
-                     std::sin(kTwoPi * x * 2.0) * 0.3) * 0.35);
+        put(pad, i,
+            (std::sin(kTwoPi * x) + std::sin(kTwoPi * x * 1.0035) * 0.8 + std::sin(kTwoPi * x * 2.0) * 0.3) *
+                0.35);
     }
     loop_whole(pad, 0);
 }
@@ -103,11 +104,11 @@ TNOTE& cell(Engine& e, int pattern, int row, int track) {
     return e.bank.song_pattern(pattern)->col[track][row];
 }
 
-void note(Engine& e, int pattern, int row, int track, int n, int instrument, int volume = 0,
-          int command = 0, int parameter = 0) {
-    cell(e, pattern, row, track) = {static_cast<uint8_t>(n), static_cast<uint8_t>(volume), 0,
-                                    static_cast<uint8_t>(instrument), static_cast<uint8_t>(command),
-                                    static_cast<uint8_t>(parameter)};
+void note(Engine& e, int pattern, int row, int track, int n, int instrument, int volume = 0, int command = 0,
+          int parameter = 0) {
+    cell(e, pattern, row, track) = {
+        static_cast<uint8_t>(n),          static_cast<uint8_t>(volume),  0,
+        static_cast<uint8_t>(instrument), static_cast<uint8_t>(command), static_cast<uint8_t>(parameter)};
 }
 
 void drums(Engine& e, int p, bool full) {

@@ -19,6 +19,8 @@ bool load_for_cli(Engine& engine, const std::string& path) {
     return true;
 }
 
-bool is_terminal(int fd) { return ::isatty(fd) == 1; }
+bool is_terminal(int fd) {
+    return ::isatty(fd) == 1;
+}
 
 }  // namespace ondrel

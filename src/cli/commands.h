@@ -6,8 +6,8 @@ namespace ondrel {
 
 // Exit codes that scripts can rely on.
 inline constexpr int kExitOk = 0;
-inline constexpr int kExitFailed = 1;  // the work could not be done (bad file, no device)
-inline constexpr int kExitUsage = 2;   // the command line was wrong
+inline constexpr int kExitFailed = 1;    // the work could not be done (bad file, no device)
+inline constexpr int kExitUsage = 2;     // the command line was wrong
 inline constexpr int kExitNoDevice = 3;  // no sound device could be opened
 
 using Args = std::vector<std::string>;

@@ -22,7 +22,8 @@ const Command kCommands[] = {
 };
 
 void usage(std::ostream& out) {
-    out << "Ondrel Tracker " ONDREL_VERSION "\n\n"
+    out << "Ondrel Tracker " ONDREL_VERSION
+           "\n\n"
            "usage: ondrel COMMAND [OPTIONS] FILE\n\n"
            "commands:\n";
     for (const auto& c : kCommands) out << "  " << c.summary << "\n";

@@ -1,9 +1,9 @@
 #include <algorithm>
 #include <chrono>
 #include <csignal>
-#include <mutex>
 #include <cstdio>
 #include <iostream>
+#include <mutex>
 #include <thread>
 
 #include "cli/cli_load.h"
@@ -17,7 +17,9 @@ namespace ondrel {
 namespace {
 
 volatile std::sig_atomic_t interrupted = 0;
-void on_interrupt(int) { interrupted = 1; }
+void on_interrupt(int) {
+    interrupted = 1;
+}
 
 void play_usage(std::ostream& out) {
     out << "usage: ondrel play FILE [options]\n"
@@ -98,7 +100,8 @@ int cmd_play(const Args& args) {
     const char* ended = "the end of the song";
     for (;;) {
         std::this_thread::sleep_for(std::chrono::milliseconds(50));
-        const double seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - started).count();
+        const double seconds =
+            std::chrono::duration<double>(std::chrono::steady_clock::now() - started).count();
         if (status) show_status(engine, seconds);
         Message msg;
         while (player.to_window.pop(msg)) {

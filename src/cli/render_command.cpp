@@ -79,17 +79,17 @@ int cmd_render(const Args& args) {
     const auto started = std::chrono::steady_clock::now();
     auto last_shown = started;
     const TMOD& song = engine.bank.current();
-    const RenderEnd end = render_offline(
-        engine.mixer, engine.player, OfflineOptions{sound.buffer_frames, sound.max_seconds},
-        [&](const float* frames, int count, double seconds) {
-            if (!wav.write(frames, static_cast<size_t>(count))) return false;
-            const auto now = std::chrono::steady_clock::now();
-            if (progress && now - last_shown > std::chrono::milliseconds(100)) {
-                show_progress(engine.player, song, seconds);
-                last_shown = now;
-            }
-            return true;
-        });
+    const RenderEnd end =
+        render_offline(engine.mixer, engine.player, OfflineOptions{sound.buffer_frames, sound.max_seconds},
+                       [&](const float* frames, int count, double seconds) {
+                           if (!wav.write(frames, static_cast<size_t>(count))) return false;
+                           const auto now = std::chrono::steady_clock::now();
+                           if (progress && now - last_shown > std::chrono::milliseconds(100)) {
+                               show_progress(engine.player, song, seconds);
+                               last_shown = now;
+                           }
+                           return true;
+                       });
     if (progress) std::fprintf(stderr, "\r%70s\r", "");
     if (end == RenderEnd::Aborted || !wav.finish(why)) {
         std::cerr << "ondrel: " << (why.empty() ? "cannot write " + out : why) << "\n";

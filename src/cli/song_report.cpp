@@ -165,8 +165,8 @@ std::string song_text(const SongBank& bank, int song, const EffectSlots& slots) 
             cells += n;
             if (n) used += " " + std::to_string(t + 1);
         }
-        std::snprintf(line, sizeof line, "  %3d  %4d rows  %2d tracks  %5d cells  used tracks:%s\n",
-                      i, rows, p->allocated_tracks(), cells, used.empty() ? " none" : used.c_str());
+        std::snprintf(line, sizeof line, "  %3d  %4d rows  %2d tracks  %5d cells  used tracks:%s\n", i, rows,
+                      p->allocated_tracks(), cells, used.empty() ? " none" : used.c_str());
         o << line;
     }
     o << "\nSamples:\n";
@@ -183,8 +183,8 @@ std::string song_text(const SongBank& bank, int song, const EffectSlots& slots) 
         else
             std::snprintf(loop, sizeof loop, "%-20s", "   no loop");
         std::snprintf(line, sizeof line, " %3d  %-32s %6u  %4d  %2s %10u %s  %4d  %3d  %4d\n", i + 1,
-                      printable(s->name).c_str(), s->rate, s->bits, s->stereo ? "st" : "mo",
-                      s->length, loop, s->volume, s->refnote, s->finetune);
+                      printable(s->name).c_str(), s->rate, s->bits, s->stereo ? "st" : "mo", s->length, loop,
+                      s->volume, s->refnote, s->finetune);
         o << line;
     }
     if (!count) o << "  (none)\n";

@@ -28,7 +28,8 @@ const char* sound_options_help() {
            "  --buffer FRAMES      frames per buffer, 64 to 4096 (default 1024)\n";
 }
 
-bool parse_sound_option(const std::vector<std::string>& args, size_t& i, SoundOptions& o, std::string& error) {
+bool parse_sound_option(const std::vector<std::string>& args, size_t& i, SoundOptions& o,
+                        std::string& error) {
     const std::string& a = args[i];
     auto value = [&](std::string& out) {
         if (i + 1 >= args.size()) {

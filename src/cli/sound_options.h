@@ -13,7 +13,7 @@ struct SoundOptions {
     bool interpolate = false;
     bool tick_accurate = true;
     int pitch = 128;
-    int master = -1;  // -1: the song's own
+    int master = -1;         // -1: the song's own
     std::vector<int> muted;  // 1-based tracks
     double max_seconds = 0;
     int buffer_frames = 1024;

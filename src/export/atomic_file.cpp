@@ -67,8 +67,7 @@ void ReplacingFile::abandon() {
     }
 }
 
-bool write_file_atomically(const std::string& path, const std::vector<uint8_t>& bytes,
-                           std::string& why) {
+bool write_file_atomically(const std::string& path, const std::vector<uint8_t>& bytes, std::string& why) {
     ReplacingFile file;
     if (!file.open(path, why)) return false;
     if (!bytes.empty() && std::fwrite(bytes.data(), 1, bytes.size(), file.stream()) != bytes.size()) {

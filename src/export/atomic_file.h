@@ -26,7 +26,6 @@ private:
     std::string path_, temp_;
 };
 
-bool write_file_atomically(const std::string& path, const std::vector<uint8_t>& bytes,
-                           std::string& why);
+bool write_file_atomically(const std::string& path, const std::vector<uint8_t>& bytes, std::string& why);
 
 }  // namespace ondrel

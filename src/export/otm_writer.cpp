@@ -88,9 +88,9 @@ void write_track(ByteWriter& w, const TNOTE* column, int rows) {
     };
     for (int r = 0; r < rows; ++r) {
         const TNOTE& c = column[r];
-        const uint8_t flag = static_cast<uint8_t>((c.note ? 1 : 0) | (c.instrument ? 2 : 0) |
-                                                  (c.volume ? 4 : 0) | (c.command ? 8 : 0) |
-                                                  (c.parameter ? 16 : 0));
+        const uint8_t flag =
+            static_cast<uint8_t>((c.note ? 1 : 0) | (c.instrument ? 2 : 0) | (c.volume ? 4 : 0) |
+                                 (c.command ? 8 : 0) | (c.parameter ? 16 : 0));
         if (!flag) continue;
         move_to(r);
         t.u8(flag);
@@ -163,8 +163,7 @@ std::vector<uint8_t> write_otm(const SongBank& bank, int song, const EffectSlots
     return std::move(w.bytes);
 }
 
-bool save_otm(const std::string& path, SongBank& bank, int song, const EffectSlots& slots,
-              std::string& why) {
+bool save_otm(const std::string& path, SongBank& bank, int song, const EffectSlots& slots, std::string& why) {
     if (song < 0 || song >= bank.nbimod) {
         why = "no such song";
         return false;

@@ -13,7 +13,6 @@ namespace ondrel {
 std::vector<uint8_t> write_otm(const SongBank& bank, int song, const EffectSlots& slots);
 
 // Saves the song to path (atomically) and records path in the song; false with why set.
-bool save_otm(const std::string& path, SongBank& bank, int song, const EffectSlots& slots,
-              std::string& why);
+bool save_otm(const std::string& path, SongBank& bank, int song, const EffectSlots& slots, std::string& why);
 
 }  // namespace ondrel

@@ -16,7 +16,8 @@ int wav_sample_bytes(WavSampleFormat format) {
     return 2;
 }
 
-bool WavWriter::open(const std::string& path, int channels, int rate, WavSampleFormat format, std::string& why) {
+bool WavWriter::open(const std::string& path, int channels, int rate, WavSampleFormat format,
+                     std::string& why) {
     if (!file_.open(path, why)) return false;
     channels_ = channels;
     rate_ = rate;
@@ -41,7 +42,9 @@ void le32(std::vector<uint8_t>& b, uint32_t v) {
     le16(b, v & 0xffff);
     le16(b, v >> 16);
 }
-void tag(std::vector<uint8_t>& b, const char* t) { b.insert(b.end(), t, t + 4); }
+void tag(std::vector<uint8_t>& b, const char* t) {
+    b.insert(b.end(), t, t + 4);
+}
 }  // namespace
 
 bool WavWriter::write_header(uint32_t data_bytes) {
@@ -124,7 +127,8 @@ bool WavWriter::finish(std::string& why) {
         return false;
     }
     if (data_bytes & 1) put("", 1);
-    if (!failed_ && std::fseek(file_.stream(), 0, SEEK_SET) == 0) write_header(static_cast<uint32_t>(data_bytes));
+    if (!failed_ && std::fseek(file_.stream(), 0, SEEK_SET) == 0)
+        write_header(static_cast<uint32_t>(data_bytes));
     if (failed_) {
         why = "cannot write the sound file";
         abandon();
@@ -133,6 +137,8 @@ bool WavWriter::finish(std::string& why) {
     return file_.commit(why);
 }
 
-void WavWriter::abandon() { file_.abandon(); }
+void WavWriter::abandon() {
+    file_.abandon();
+}
 
 }  // namespace ondrel

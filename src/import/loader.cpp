@@ -6,8 +6,7 @@
 
 namespace ondrel {
 
-bool read_file(const std::string& path, std::vector<uint8_t>& bytes, std::string& why,
-               size_t max_bytes) {
+bool read_file(const std::string& path, std::vector<uint8_t>& bytes, std::string& why, size_t max_bytes) {
     std::ifstream in(path, std::ios::binary | std::ios::ate);
     if (!in) {
         why = "cannot open " + path + ": " + std::strerror(errno);
@@ -41,8 +40,7 @@ const char* packer_of(const std::vector<uint8_t>& bytes) {
 
 namespace {
 
-void apply_effects(const EffectsRead& fx, const TMOD& song, EffectSlots& slots,
-                   StructureLock& lock) {
+void apply_effects(const EffectsRead& fx, const TMOD& song, EffectSlots& slots, StructureLock& lock) {
     if (fx.renumber) slots.clear_numbering();
     for (int slot : fx.numbered_slots) slots.number_buffer(slot);
     slots.reserve_send_buffers(slots.nbbufferefx);

@@ -15,17 +15,17 @@ namespace ondrel {
 struct EffectsRead {
     bool has_added_types = false;  // slots 20..99 replaced by the file
     std::array<int16_t, kEffectSlots> added_types{};
-    bool renumber = false;  // the file restarts the effect-buffer numbering
+    bool renumber = false;            // the file restarts the effect-buffer numbering
     std::vector<int> numbered_slots;  // effect buffers named by the file, in order
-    uint32_t echo_units_set = 0;  // bit u: echo unit u's line follows the new length
+    uint32_t echo_units_set = 0;      // bit u: echo unit u's line follows the new length
 };
 
 // A module being read: the song as it will be installed, and what the reader saw.
 struct ModuleRead {
     SongData song;
     EffectsRead effects;
-    bool truncated = false;  // the file ended early; what was read is kept
-    std::string error;  // why the file was refused, when a reader returns false
+    bool truncated = false;          // the file ended early; what was read is kept
+    std::string error;               // why the file was refused, when a reader returns false
     std::vector<std::string> notes;  // things worth telling the user
 };
 
@@ -45,5 +45,8 @@ const std::vector<ModuleReaderEntry>& module_readers();
 const ModuleReaderEntry& reader_for(const std::string& path);
 
 bool read_otm(ByteReader& file, ModuleRead& out);
+bool read_mod(ByteReader& file, ModuleRead& out);
+bool read_s3m(ByteReader& file, ModuleRead& out);
+bool read_mtm(ByteReader& file, ModuleRead& out);
 
 }  // namespace ondrel

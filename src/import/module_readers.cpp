@@ -6,10 +6,8 @@ namespace ondrel {
 
 const std::vector<ModuleReaderEntry>& module_readers() {
     static const std::vector<ModuleReaderEntry> table = {
-        {"", "ProTracker Module & compatible", nullptr},
-        {".mtm", "Multi Tracker Module", nullptr},
-        {".otm", "Ondrel Tracker Module", read_otm},
-        {".s3m", "Scream Tracker Module", nullptr},
+        {"", "ProTracker Module & compatible", read_mod}, {".mtm", "Multi Tracker Module", read_mtm},
+        {".otm", "Ondrel Tracker Module", read_otm},      {".s3m", "Scream Tracker Module", read_s3m},
         {".xm", "FastTracker Module", nullptr},
     };
     return table;
@@ -20,8 +18,7 @@ bool ends_with_nocase(const std::string& s, const char* tail) {
     const std::string t(tail);
     if (t.empty() || t.size() > s.size()) return false;
     for (size_t i = 0; i < t.size(); ++i)
-        if (std::tolower(static_cast<unsigned char>(s[s.size() - t.size() + i])) != t[i])
-            return false;
+        if (std::tolower(static_cast<unsigned char>(s[s.size() - t.size() + i])) != t[i]) return false;
     return true;
 }
 }  // namespace

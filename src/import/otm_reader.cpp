@@ -11,8 +11,8 @@ namespace ondrel {
 namespace {
 
 constexpr uint32_t id(const char (&s)[5]) {
-    return uint32_t(uint8_t(s[0])) << 24 | uint32_t(uint8_t(s[1])) << 16 |
-           uint32_t(uint8_t(s[2])) << 8 | uint32_t(uint8_t(s[3]));
+    return uint32_t(uint8_t(s[0])) << 24 | uint32_t(uint8_t(s[1])) << 16 | uint32_t(uint8_t(s[2])) << 8 |
+           uint32_t(uint8_t(s[3]));
 }
 
 constexpr size_t kInstShortHeader = 50;
@@ -54,8 +54,7 @@ bool read_dwords_le(ByteReader& r, T* out, int n) {
     if (r.read(raw.data(), raw.size()) != raw.size()) return false;
     for (int i = 0; i < n; ++i) {
         const uint8_t* p = &raw[4 * i];
-        out[i] = static_cast<T>(uint32_t{p[3]} << 24 | uint32_t{p[2]} << 16 |
-                                uint32_t{p[1]} << 8 | p[0]);
+        out[i] = static_cast<T>(uint32_t{p[3]} << 24 | uint32_t{p[2]} << 16 | uint32_t{p[1]} << 8 | p[0]);
     }
     return true;
 }
@@ -115,8 +114,7 @@ void chunk_INST(OtmState& st, ByteReader& b) {
 void chunk_OAIT(OtmState& st, ByteReader& b) {
     const uint16_t number = b.u16be();
     if (number >= 256 || st.inst_header >= st.inst_count) return;
-    ByteReader h(std::span<const uint8_t>(st.inst.data() + st.inst_first +
-                                              st.inst_header * st.inst_size,
+    ByteReader h(std::span<const uint8_t>(st.inst.data() + st.inst_first + st.inst_header * st.inst_size,
                                           st.inst_size));
     ++st.inst_header;
     // The headers are per song (128 slots); higher numbers have no slot to go to.
@@ -460,15 +458,14 @@ bool read_otm(ByteReader& file, ModuleRead& out) {
     uint8_t header[8];
     size_t got = 0;
     while ((got = file.read(header, 8)) == 8) {
-        const uint32_t chunk = uint32_t{header[0]} << 24 | uint32_t{header[1]} << 16 |
-                               uint32_t{header[2]} << 8 | header[3];
+        const uint32_t chunk =
+            uint32_t{header[0]} << 24 | uint32_t{header[1]} << 16 | uint32_t{header[2]} << 8 | header[3];
         const bool new_block = chunk == id("o.t.") || chunk == id(".t.o");
         if (new_block) st.little = true;
-        const uint32_t length =
-            st.little ? uint32_t{header[7]} << 24 | uint32_t{header[6]} << 16 |
-                            uint32_t{header[5]} << 8 | header[4]
-                      : uint32_t{header[4]} << 24 | uint32_t{header[5]} << 16 |
-                            uint32_t{header[6]} << 8 | header[7];
+        const uint32_t length = st.little ? uint32_t{header[7]} << 24 | uint32_t{header[6]} << 16 |
+                                                uint32_t{header[5]} << 8 | header[4]
+                                          : uint32_t{header[4]} << 24 | uint32_t{header[5]} << 16 |
+                                                uint32_t{header[6]} << 8 | header[7];
         ByteReader body = file.sub(length);
         if (!dispatch(st, chunk, body)) break;
         ++chunks;

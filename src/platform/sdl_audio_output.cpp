@@ -9,7 +9,9 @@ namespace ondrel {
 SdlAudioOutput::SdlAudioOutput(Mixer& mixer, Player& player, SongBank& bank)
     : mixer_(mixer), player_(player), bank_(bank) {}
 
-SdlAudioOutput::~SdlAudioOutput() { close(); }
+SdlAudioOutput::~SdlAudioOutput() {
+    close();
+}
 
 namespace {
 // The sound libraries under SDL print their own complaints while they probe for a card;
@@ -78,7 +80,9 @@ void SdlAudioOutput::close() {
     SDL_QuitSubSystem(SDL_INIT_AUDIO);
 }
 
-const char* SdlAudioOutput::driver() const { return driver_.c_str(); }
+const char* SdlAudioOutput::driver() const {
+    return driver_.c_str();
+}
 
 void SdlAudioOutput::lock() {
     if (device_) SDL_LockAudioDevice(device_);

@@ -8,7 +8,9 @@ namespace ondrel {
 
 namespace {
 
-int clamp_volume(int v) { return std::clamp(v, 0, 128); }
+int clamp_volume(int v) {
+    return std::clamp(v, 0, 128);
+}
 
 void slide_up(Voice& v, int amount) {
     v.baseperiod = std::max(v.baseperiod - static_cast<float>(amount), kPeriodMin);
@@ -54,7 +56,7 @@ void EffectCommands::row_start(Player& p, int t, Voice& v, const TNOTE& cell, in
         case 27: m.trackpan2[t] = static_cast<uint16_t>(param); break;
         case 30: {
             if (param > 8 || v.instrument == 0) break;
-            if (!p.bank_.sample(m.sndbase + v.instrument - 1)) break;
+            if (!p.sample_of(v.instrument)) break;
             v.block = static_cast<uint16_t>(param);
             if (param != 0) {
                 // The voice's instrument number is the mark entry, one above the entry the
@@ -189,10 +191,9 @@ void EffectCommands::delayed_trigger(Player& p, int t, Voice& v, const TNOTE& ce
     // A delay on a cell without a note has nothing to start (note 0 would be a period of
     // 6848, far below any instrument).
     if (cell.note == 0 || (cell.note & 0x80)) return;
-    const TMOD& m = p.bank_.current();
     if (cell.instrument) {
         v.instrument = cell.instrument;
-        if (const p_s* s = p.bank_.sample(m.sndbase + cell.instrument - 1)) {
+        if (const p_s* s = p.sample_of(cell.instrument)) {
             v.volume = s->volume;
             v.finetune = static_cast<uint16_t>(s->finetune);
         }

@@ -8,8 +8,8 @@ namespace ondrel {
 
 // A four-character command code, as the menus, windows and threads exchange them.
 constexpr uint32_t fourcc(const char (&s)[5]) {
-    return uint32_t(uint8_t(s[0])) << 24 | uint32_t(uint8_t(s[1])) << 16 |
-           uint32_t(uint8_t(s[2])) << 8 | uint32_t(uint8_t(s[3]));
+    return uint32_t(uint8_t(s[0])) << 24 | uint32_t(uint8_t(s[1])) << 16 | uint32_t(uint8_t(s[2])) << 8 |
+           uint32_t(uint8_t(s[3]));
 }
 
 struct Message {

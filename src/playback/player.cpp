@@ -139,10 +139,10 @@ void Player::read_track(int t, int position, const Pattern* pattern, bool auditi
     } else if (const TNOTE* c = pattern->cell(t, tr.nopos)) {
         if (tr.nopos < m.rows[m.sequence[position]]) cell = *c;
     }
-    const bool delayed = (cell.command == 14 && (cell.parameter >> 4) == 13) ||
-                         (cell.command == 26 && cell.parameter != 0);
+    const bool delayed =
+        (cell.command == 14 && (cell.parameter >> 4) == 13) || (cell.command == 26 && cell.parameter != 0);
     // A disabled instrument silences its cells, commands included.
-    if (cell.instrument && m.patflag[cell.instrument - 1] == 0) return;
+    if (cell.instrument && cell.instrument <= kSamplesPerSong && m.patflag[cell.instrument - 1] == 0) return;
 
     const bool row_start = (tr.notick == 0 && tr.patdelay == 0) || (audition_cell && tr.playing);
     if (row_start) {
@@ -192,13 +192,17 @@ void Player::take_instrument(int t, Voice& v, const TNOTE& cell) {
     v.instrument = cell.instrument;
     v.keyoff = 0;
     set_start(v);
-    const p_s* s = bank_.sample(bank_.current().sndbase + cell.instrument - 1);
-    if (s) {
+    if (const p_s* s = sample_of(cell.instrument)) {
         v.volume = s->volume;
         v.finetune = static_cast<uint16_t>(s->finetune);
     }
     v.count1 = v.count2 = 0;
     v.fraction = 0;
+}
+
+const p_s* Player::sample_of(int instrument) const {
+    if (instrument < 1 || instrument > kSamplesPerSong) return nullptr;
+    return bank_.sample(bank_.current().sndbase + instrument - 1);
 }
 
 void Player::set_start(Voice& v) const {
@@ -225,7 +229,8 @@ void Player::trigger(int t, Voice& v, int note) {
         const uint64_t now = system_time_us() / 1000;
         if (tr.notesended[t]) out->NoteOff(channel, static_cast<uint8_t>(tr.notesended[t] - 1), 100, now);
         const int volume = v.volume == 0 ? 128 : v.volume;
-        out->NoteOn(channel, static_cast<uint8_t>(note), static_cast<uint8_t>(std::min(volume * 127 / 128, 127)), now);
+        out->NoteOn(channel, static_cast<uint8_t>(note),
+                    static_cast<uint8_t>(std::min(volume * 127 / 128, 127)), now);
         tr.notesended[t] = static_cast<int16_t>(note + 1);
     } else {
         v.active = 1;

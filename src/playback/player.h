@@ -31,9 +31,9 @@ public:
     std::array<int16_t, kTracks> efxaffiche{};
     std::array<int16_t, kEffectSlots> autovar{};  // the mixer's auto-pan positions
     std::atomic<MidiOut*> papi{nullptr};
-    SpscQueue<64> to_window;                  // from the audio thread
-    std::vector<Message> window_posts;        // from the window thread itself
-    const char* status = kStatusStopped;      // the status line
+    SpscQueue<64> to_window;              // from the audio thread
+    std::vector<Message> window_posts;    // from the window thread itself
+    const char* status = kStatusStopped;  // the status line
     // Set by the audio driver while its callback may run: stopping then hands the voice
     // reset to the audio thread instead of doing it here.
     std::atomic<bool> audio_running{false};
@@ -75,6 +75,9 @@ private:
     void read_track(int track, int position, const Pattern* pattern, bool audition_cell);
     void take_instrument(int track, Voice& v, const TNOTE& cell);
     void set_start(Voice& v) const;
+    // The current song's sample of an instrument number, null when none (numbers from
+    // files can point past the song's 128 slots).
+    const p_s* sample_of(int instrument) const;
     void trigger(int track, Voice& v, int note);
     void send_program(int track, const Voice& v);
     int route_to_slot(int track, int slot);
@@ -82,8 +85,8 @@ private:
     SongBank& bank_;
     EffectSlots& slots_;
     std::array<int16_t, kTracks> curvoice_{};  // voice each track's commands act on
-    int local_pos_ = 0;                       // the position while a call works on it
-    std::vector<uint64_t> visited_;           // a bit per position and row when watched
+    int local_pos_ = 0;                        // the position while a call works on it
+    std::vector<uint64_t> visited_;            // a bit per position and row when watched
     void mark_visited();
     std::atomic<uint32_t> stop_request_{0};
     std::atomic<uint32_t> stop_done_{0};

@@ -11,7 +11,7 @@
 namespace ondrel {
 
 namespace {
-constexpr float kStep = 0.0078125f;      // 1/128
+constexpr float kStep = 0.0078125f;       // 1/128
 constexpr float kMasterStep = 0.015625f;  // 1/64
 enum Envelope { kEnvVolume = 1, kEnvSend = 2, kEnvPan = 4, kEnvPitch = 8, kEnvFade = 16 };
 }  // namespace
@@ -83,7 +83,8 @@ void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
     output_stage(out, frames, format);
 
     const double budget = std::trunc((frames * 8 * 0.125 / frame_rate) * 1000000.0);
-    if (budget > 0) powermusic.store(static_cast<float>((system_time_us() - entry) / budget), std::memory_order_relaxed);
+    if (budget > 0)
+        powermusic.store(static_cast<float>((system_time_us() - entry) / budget), std::memory_order_relaxed);
 }
 
 void Mixer::number_routed_slots(const TMOD& m) {
@@ -148,16 +149,23 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     if (env & kEnvVolume) g *= player_.compute_adsr(0, vi, static_cast<unsigned long>(frames), s);
     g *= v.volume * kStep;
     int pan = m.trackvol[track];
-    if (env & kEnvPan) pan = static_cast<int>(player_.compute_adsr(2, vi, static_cast<unsigned long>(frames), s));
+    if (env & kEnvPan)
+        pan = static_cast<int>(player_.compute_adsr(2, vi, static_cast<unsigned long>(frames), s));
     pan = std::clamp(pan, 0, 127);
     float gl = g * tab_pan()[pan];
     float gr = g * tab_pan()[127 - pan];
     switch (m.mode) {
         case 1:  // Amiga: voices 0 and 3 right, 1 and 2 left
-            if (vi % 4 == 0 || vi % 4 == 3) gl = 0; else gr = 0;
+            if (vi % 4 == 0 || vi % 4 == 3)
+                gl = 0;
+            else
+                gr = 0;
             break;
         case 3:  // L&R: even voices right, odd voices left
-            if (vi % 2 == 0) gl = 0; else gr = 0;
+            if (vi % 2 == 0)
+                gl = 0;
+            else
+                gr = 0;
             break;
         default: break;
     }
@@ -176,7 +184,11 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
         send = slots_.pbufferefx[k - 1].get() + c0;
         send_level = e1 * kStep;
         switch (slots_.efxtype[slot]) {
-            case 1: case 2: case 3: case 16: case 17:  // heard only through the filter
+            case 1:
+            case 2:
+            case 3:
+            case 16:
+            case 17:  // heard only through the filter
                 send_level = m.trackpan[track] * kStep;
                 gl = gr = 0;
                 break;
@@ -296,12 +308,15 @@ void Mixer::output_stage(float* out, int frames, const AudioFormat& format) {
     rmax.store(rpeak, std::memory_order_relaxed);
     if (f_fftmode.load(std::memory_order_relaxed) == 1)
         for (int i = 0; i < std::min(frames, 512); ++i)
-            Bufferfft1[i].store(static_cast<double>(out[2 * i + 1] * 0.5f + out[2 * i] * 0.5f), std::memory_order_relaxed);
-    if (record_to_file.load(std::memory_order_relaxed) && frecmusic.load(std::memory_order_relaxed) && recorder_) {
+            Bufferfft1[i].store(static_cast<double>(out[2 * i + 1] * 0.5f + out[2 * i] * 0.5f),
+                                std::memory_order_relaxed);
+    if (record_to_file.load(std::memory_order_relaxed) && frecmusic.load(std::memory_order_relaxed) &&
+        recorder_) {
         for (int i = 0; i < 2 * frames; ++i) bufferrecmusic_[i] = static_cast<int16_t>(out[i] * 32767);
         recorder_->RecordFile(bufferrecmusic_.data(), static_cast<size_t>(4 * frames), format);
     }
-    if (monitor.load(std::memory_order_relaxed) && !frecmusic.load(std::memory_order_relaxed) && monitor_ring_) {
+    if (monitor.load(std::memory_order_relaxed) && !frecmusic.load(std::memory_order_relaxed) &&
+        monitor_ring_) {
         // Added after the clip and the meters: the monitored input is neither.
         MonitorRing& ring = *monitor_ring_;
         constexpr size_t kValues = MonitorRing::kBytes / 2;

@@ -6,7 +6,8 @@
 
 namespace ondrel {
 
-RenderEnd render_offline(Mixer& mixer, Player& player, const OfflineOptions& options, const RenderSink& sink) {
+RenderEnd render_offline(Mixer& mixer, Player& player, const OfflineOptions& options,
+                         const RenderSink& sink) {
     const int frames = std::clamp(options.buffer_frames, 16, kMaxFramesPerCall);
     std::vector<float> buffer(2 * static_cast<size_t>(frames));
     const AudioFormat format{static_cast<float>(kOutputRate), 2, kFormatFloat};
@@ -32,7 +33,8 @@ RenderEnd render_offline(Mixer& mixer, Player& player, const OfflineOptions& opt
             // half-tick to its end.
             while (mixer.bpmreste >= 1 && done < limit && end != RenderEnd::Aborted) {
                 const int owed = static_cast<int>(std::min<double>(mixer.bpmreste, frames));
-                mixer.BufferProc(nullptr, buffer.data(), static_cast<unsigned long>(owed) * 2 * sizeof(float), format);
+                mixer.BufferProc(nullptr, buffer.data(), static_cast<unsigned long>(owed) * 2 * sizeof(float),
+                                 format);
                 const int tail = static_cast<int>(std::min<uint64_t>(owed, limit - done));
                 done += static_cast<uint64_t>(tail);
                 if (!sink(buffer.data(), tail, done / kOutputRate)) end = RenderEnd::Aborted;

@@ -10,8 +10,8 @@ inline float sample_at(const S* d, int64_t i) {
 }
 
 template <typename S, bool Interpolate, SendMode Send>
-double mix_mono(const void* data, int64_t pos, double x, double step, int count, float* out,
-                float* send, const MixGains& g) {
+double mix_mono(const void* data, int64_t pos, double x, double step, int count, float* out, float* send,
+                const MixGains& g) {
     const S* d = static_cast<const S*>(data) + pos;
     for (int i = 0; i < count; ++i) {
         const int64_t whole = static_cast<int64_t>(x);
@@ -64,6 +64,8 @@ MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send) {
     return bits16 ? pick_mono<sample16_t>(interpolate, send) : pick_mono<int8_t>(interpolate, send);
 }
 
-StereoMixFn stereo_mixer(bool bits16) { return bits16 ? mix_stereo<sample16_t> : mix_stereo<int8_t>; }
+StereoMixFn stereo_mixer(bool bits16) {
+    return bits16 ? mix_stereo<sample16_t> : mix_stereo<int8_t>;
+}
 
 }  // namespace ondrel

@@ -17,11 +17,11 @@ struct MixGains {
 
 // Mixes count frames of a mono sample starting at frame pos, offset x (grows by step),
 // into interleaved out and the mono send buffer; returns the final x.
-using MonoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count,
-                             float* out, float* send, const MixGains& g);
+using MonoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count, float* out,
+                             float* send, const MixGains& g);
 // Stereo samples are never interpolated and never sent.
-using StereoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count,
-                               float* out, const MixGains& g);
+using StereoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count, float* out,
+                               const MixGains& g);
 
 // The loop for a case; bits16 selects 16-bit data.
 MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send);

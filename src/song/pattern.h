@@ -7,8 +7,6 @@
 
 namespace ondrel {
 
-
-
 // A pattern: one column pointer per track; a column holds the pattern's rows cells.
 struct Pattern {
     std::array<std::unique_ptr<TNOTE[]>, kTracks> col;

@@ -9,12 +9,12 @@ namespace ondrel {
 void SampleFree::operator()(p_s* s) const {
     if (!s) return;
     s->~p_s();
-    ::operator delete(static_cast<void*>(s), std::align_val_t{alignof(std::max_align_t)});
+    ::operator delete (static_cast<void*>(s), std::align_val_t{alignof(std::max_align_t)});
 }
 
 SampleRef make_sample(uint32_t length) {
     const size_t bytes = sizeof(p_s) + size_t{length} + kSampleSlack;
-    void* raw = ::operator new(bytes, std::align_val_t{alignof(std::max_align_t)});
+    void* raw = ::operator new (bytes, std::align_val_t{alignof(std::max_align_t)});
     std::memset(raw, 0, bytes);
     auto* s = new (raw) p_s{};
     Raz_data(*s);

@@ -15,10 +15,10 @@ inline constexpr uint32_t kMaxSampleBytes = 64u << 20;
 // allocation (see make_sample).
 struct p_s {
     uint32_t rate;
-    uint8_t* data;  // null when the sample is empty
-    uint32_t length;  // bytes
+    uint8_t* data;       // null when the sample is empty
+    uint32_t length;     // bytes
     uint32_t loopstart;  // bytes
-    uint32_t loopend;  // bytes
+    uint32_t loopend;    // bytes
     int16_t loopon;
     int16_t refnote;
     uint8_t spare[4];
@@ -26,12 +26,12 @@ struct p_s {
     int16_t volume;  // 0..128
     int16_t bits;    // 8 or 16
     uint8_t stereo;
-    uint8_t flag2;  // bit 0: always interpolate
+    uint8_t flag2;      // bit 0: always interpolate
     int16_t framecode;  // log2 of bytes per frame
     int16_t range1[2];
     int16_t range2[2];
     uint16_t envelope[kEnvelopePoints * kEnvelopeKinds];  // point-major: [point * 5 + kind]
-    uint16_t flagword;  // envelope enable bits
+    uint16_t flagword;                                    // envelope enable bits
     int16_t range3[2];
     int16_t level;
     int16_t finetune;

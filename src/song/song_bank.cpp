@@ -27,7 +27,9 @@ private:
 };
 }  // namespace
 
-SongData::SongData() : mod(std::make_unique<TMOD>()) { set_new_song_defaults(*mod, 0); }
+SongData::SongData() : mod(std::make_unique<TMOD>()) {
+    set_new_song_defaults(*mod, 0);
+}
 
 SongBank::SongBank(AlertSink* alerts) : alerts_(alerts) {
     newmusic();
@@ -133,10 +135,8 @@ void SongBank::install(int song, SongData&& data) {
     {
         SwapGuard guard(*lock_, loadin);
         timod[song].swap(data.mod);
-        for (int i = 0; i < kPatternsPerSong; ++i)
-            p_pat[song * kPatternsPerSong + i].swap(data.patterns[i]);
-        for (int i = 0; i < kSamplesPerSong; ++i)
-            t_sound[song * kSamplesPerSong + i].swap(data.samples[i]);
+        for (int i = 0; i < kPatternsPerSong; ++i) p_pat[song * kPatternsPerSong + i].swap(data.patterns[i]);
+        for (int i = 0; i < kSamplesPerSong; ++i) t_sound[song * kSamplesPerSong + i].swap(data.samples[i]);
     }
     if (song == noimod) nbvoie = current().nbtrack;
     // data now holds the old song and frees it here, outside the swap.
@@ -159,10 +159,8 @@ void SongBank::killmusic() {
         SwapGuard guard(*lock_, loadin);
         const auto pat_at = p_pat.begin() + song * kPatternsPerSong;
         const auto snd_at = t_sound.begin() + song * kSamplesPerSong;
-        old_pats.assign(std::make_move_iterator(pat_at),
-                        std::make_move_iterator(pat_at + kPatternsPerSong));
-        old_snds.assign(std::make_move_iterator(snd_at),
-                        std::make_move_iterator(snd_at + kSamplesPerSong));
+        old_pats.assign(std::make_move_iterator(pat_at), std::make_move_iterator(pat_at + kPatternsPerSong));
+        old_snds.assign(std::make_move_iterator(snd_at), std::make_move_iterator(snd_at + kSamplesPerSong));
         p_pat.erase(pat_at, pat_at + kPatternsPerSong);
         t_sound.erase(snd_at, snd_at + kSamplesPerSong);
         old_mod = std::move(timod[song]);

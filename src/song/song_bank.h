@@ -34,7 +34,7 @@ public:
     int16_t nbimod = 0;
     int16_t noimod = 0;
     uint8_t fmulload = 0;
-    std::vector<PatternRef> p_pat;  // nbimod x 128
+    std::vector<PatternRef> p_pat;   // nbimod x 128
     std::vector<SampleRef> t_sound;  // nbimod x 128
     int16_t nbvoie = 0;
     // Set while a whole song is swapped in; the render callback then renders silence.

@@ -4,7 +4,7 @@
 
 namespace ondrel {
 
-inline constexpr int kMaxSongs = 64;          // entries of timod; 63 usable
+inline constexpr int kMaxSongs = 64;  // entries of timod; 63 usable
 inline constexpr int kSongsUsable = 63;
 inline constexpr int kPatternsPerSong = 128;
 inline constexpr int kSamplesPerSong = 128;

@@ -68,8 +68,10 @@ void fill_song(SongBank& bank, EffectSlots& slots, unsigned seed) {
             for (int r = 0; r < rows[p]; ++r) {
                 if (any(0, 3) != 0 && r != rows[p] - 1) continue;
                 pat.col[t][r] = {static_cast<uint8_t>(any(0, 4) ? any(1, 127) : 0x80 | any(0, 127)),
-                                 static_cast<uint8_t>(any(0, 128)), 0,
-                                 static_cast<uint8_t>(any(0, 127)), static_cast<uint8_t>(any(0, 40)),
+                                 static_cast<uint8_t>(any(0, 128)),
+                                 0,
+                                 static_cast<uint8_t>(any(0, 127)),
+                                 static_cast<uint8_t>(any(0, 40)),
                                  static_cast<uint8_t>(any(0, 255))};
             }
         }

@@ -1,8 +1,9 @@
+#include "import/loader.h"
+
 #include <gtest/gtest.h>
 
 #include <algorithm>
 
-#include "import/loader.h"
 #include "support/chunk_builder.h"
 #include "support/temp_dir.h"
 
@@ -165,8 +166,7 @@ TEST_F(LoaderTest, EveryTruncationLoadsWithinBoundsAndKeepsAPrefix) {
             EXPECT_LE(out.song.samples[0]->length, 64u);
             EXPECT_LE(out.song.samples[0]->loopend, out.song.samples[0]->length);
         }
-        const bool on_boundary =
-            std::find(chunk_ends.begin(), chunk_ends.end(), n) != chunk_ends.end();
+        const bool on_boundary = std::find(chunk_ends.begin(), chunk_ends.end(), n) != chunk_ends.end();
         EXPECT_EQ(out.truncated, !on_boundary) << n;
     }
 }

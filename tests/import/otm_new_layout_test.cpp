@@ -18,23 +18,23 @@ Bytes song_block(int version, std::initializer_list<int> sequence) {
     b.le16(static_cast<int>(sequence.size())).le16(1);
     for (int p : sequence) b.u8(p);
     b.text("New Song", 64);
-    for (int t = 0; t < 64; ++t) b.le16(100 + t);  // trackpan and trackpan2
-    for (int t = 0; t < 64; ++t) b.le16(t);        // trackc
-    for (int t = 0; t < 64; ++t) b.le16(t);        // trackvol
+    for (int t = 0; t < 64; ++t) b.le16(100 + t);         // trackpan and trackpan2
+    for (int t = 0; t < 64; ++t) b.le16(t);               // trackc
+    for (int t = 0; t < 64; ++t) b.le16(t);               // trackvol
     for (int t = 0; t < 64; ++t) b.le16(t == 3 ? 7 : 0);  // tracke
     if (version < 1) return b;
-    for (int t = 0; t < 64; ++t) b.le16(200 + t);  // trackpan2
+    for (int t = 0; t < 64; ++t) b.le16(200 + t);    // trackpan2
     for (int t = 0; t < 64; ++t) b.le16(t % 5 + 1);  // nbvoice
-    for (int i = 0; i < 256; ++i) b.u8(i);         // trackblock
-    for (int t = 0; t < 64; ++t) b.le16(t % 16);   // trackword1
-    for (int t = 0; t < 64; ++t) b.le16(300 + t);  // trackd
-    for (int t = 0; t < 64; ++t) b.le16(400 + t);  // trackf
+    for (int i = 0; i < 256; ++i) b.u8(i);           // trackblock
+    for (int t = 0; t < 64; ++t) b.le16(t % 16);     // trackword1
+    for (int t = 0; t < 64; ++t) b.le16(300 + t);    // trackd
+    for (int t = 0; t < 64; ++t) b.le16(400 + t);    // trackf
     for (int i = 0; i < 128 * 8; ++i) b.le32(static_cast<uint32_t>(i)).le32(static_cast<uint32_t>(-i));
-    for (int s = 0; s < 100; ++s) b.u8(s & 1);     // efxflag
-    for (int s = 0; s < 100; ++s) b.u8(0xEE);      // overwritten by block B
-    for (int s = 0; s < 100; ++s) b.le16(s);       // efxa
-    for (int s = 0; s < 100; ++s) b.le16(255 - s);  // efxb
-    for (int s = 0; s < 100; ++s) b.le16(-s);      // efxc
+    for (int s = 0; s < 100; ++s) b.u8(s & 1);                            // efxflag
+    for (int s = 0; s < 100; ++s) b.u8(0xEE);                             // overwritten by block B
+    for (int s = 0; s < 100; ++s) b.le16(s);                              // efxa
+    for (int s = 0; s < 100; ++s) b.le16(255 - s);                        // efxb
+    for (int s = 0; s < 100; ++s) b.le16(-s);                             // efxc
     for (int s = 0; s < 100; ++s) b.le32(static_cast<uint32_t>(s * 10));  // efxval
     return b;
 }

@@ -99,14 +99,14 @@ TEST(OtmOldLayout, Layout2PlacesEventsByTick) {
     Bytes p;
     p.zeros(4).be16(9).be16(200).zeros(4);  // 200 ticks at speed 6: 33 rows
     Bytes t0;
-    t0.raw(event(40, 10, 1, 0, 0, 6).v);   // tick 0, row 0
-    t0.raw(event(41, 11, 2, 0, 0, 3).v);   // tick 6, row 1
-    t0.raw(event(42, 12, 3, 0, 0, 3).v);   // tick 9: between rows, dropped
+    t0.raw(event(40, 10, 1, 0, 0, 6).v);     // tick 0, row 0
+    t0.raw(event(41, 11, 2, 0, 0, 3).v);     // tick 6, row 1
+    t0.raw(event(42, 12, 3, 0, 0, 3).v);     // tick 9: between rows, dropped
     t0.raw(event(43, 13, 4, 4, 0x21, 0).v);  // tick 12, row 2
-    t0.raw(event(44, 14, 5, 0, 0, -6).v);  // tick 12 again: same row, dropped
+    t0.raw(event(44, 14, 5, 0, 0, -6).v);    // tick 12 again: same row, dropped
     t0.raw(event(0x85, 1, 1, 1, 1, 12).v);   // note bit 7: skipped, tick still advances
-    t0.raw(event(46, 16, 7, 0, 0, 0).v);   // tick 18, row 3
-    t0.u8(0x77);                            // an odd trailing byte, then the pad
+    t0.raw(event(46, 16, 7, 0, 0, 0).v);     // tick 18, row 3
+    t0.u8(0x77);                             // an odd trailing byte, then the pad
     p.be16(static_cast<int>(t0.size())).raw(t0.v).u8(0);
     p.be16(0);  // track 1: cleared
     Bytes t2;
@@ -137,7 +137,7 @@ TEST(OtmOldLayout, Layout3StartsAtTheTrackStartTickAndStopsAtTheRowCount) {
     Bytes p;
     p.zeros(4).be16(0).be16(8).zeros(4);  // 8 ticks at speed 4: 2 rows
     Bytes t;
-    t.zeros(5).u8(4);  // start tick 4
+    t.zeros(5).u8(4);                   // start tick 4
     t.raw(event(60, 0, 1, 0, 0, 4).v);  // row 1
     t.raw(event(61, 0, 1, 0, 0, 0).v);  // row 2: past the pattern, reading stops
     p.be16(static_cast<int>(t.size())).raw(t.v);

@@ -49,9 +49,9 @@ protected:
     TNOTE& cell(int pattern, int row, int track) { return bank.song_pattern(pattern)->col[track][row]; }
     void put(int pattern, int row, int track, int note, int instrument, int command = 0, int parameter = 0,
              int volume = 0) {
-        cell(pattern, row, track) = {static_cast<uint8_t>(note), static_cast<uint8_t>(volume), 0,
-                                     static_cast<uint8_t>(instrument), static_cast<uint8_t>(command),
-                                     static_cast<uint8_t>(parameter)};
+        cell(pattern, row, track) = {
+            static_cast<uint8_t>(note),       static_cast<uint8_t>(volume),  0,
+            static_cast<uint8_t>(instrument), static_cast<uint8_t>(command), static_cast<uint8_t>(parameter)};
     }
 
     void play(bool pattern_mode = false) { player.start(pattern_mode); }
@@ -69,7 +69,9 @@ protected:
     }
 
     Voice& voice(int v) { return player.nlist[v]; }
-    static float period_of(int note, int finetune = 0) { return finetune_factor(finetune) * floatnote()[note]; }
+    static float period_of(int note, int finetune = 0) {
+        return finetune_factor(finetune) * floatnote()[note];
+    }
 };
 
 }  // namespace ondrel::test

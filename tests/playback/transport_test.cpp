@@ -117,7 +117,7 @@ TEST_F(Transport, PatternDelayHoldsTheHalfTickWithoutRetrigger) {
     EXPECT_EQ(tr.notick, 1);
     EXPECT_EQ(tr.patdelay, 3);
     voice(0).position = 999;  // a retrigger would set it back to 0
-    calls(3);  // notick stays at 1 for 2 x 2 calls in all
+    calls(3);                 // notick stays at 1 for 2 x 2 calls in all
     EXPECT_EQ(tr.notick, 1);
     EXPECT_EQ(tr.patdelay, 0);
     calls(10);

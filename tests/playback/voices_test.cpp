@@ -80,11 +80,11 @@ protected:
 TEST_F(Envelopes, SegmentsAreLaidOverTheSampleLength) {
     set(0, {0, 64, 128, 192, 255}, {0, 128, 64, 64, 32});
     EXPECT_EQ(at(0, 0, 1000), 0.0f);
-    EXPECT_EQ(at(0, 500, 1000), 65 / 128.0f);   // x 127, between 128 at x 64 and 64 at x 128
-    EXPECT_EQ(at(0, 251, 1000), 1.0f);          // x 64: the start of the second segment
-    EXPECT_EQ(at(0, 100, 1000), 50 / 128.0f);   // x 25 on the rising first segment
-    EXPECT_EQ(at(0, 999, 1000), 33 / 128.0f);   // x 254: last segment, not yet 0
-    EXPECT_EQ(at(0, 1000, 1000), 0.0f);           // x 255 = x4: zero only at the very end
+    EXPECT_EQ(at(0, 500, 1000), 65 / 128.0f);  // x 127, between 128 at x 64 and 64 at x 128
+    EXPECT_EQ(at(0, 251, 1000), 1.0f);         // x 64: the start of the second segment
+    EXPECT_EQ(at(0, 100, 1000), 50 / 128.0f);  // x 25 on the rising first segment
+    EXPECT_EQ(at(0, 999, 1000), 33 / 128.0f);  // x 254: last segment, not yet 0
+    EXPECT_EQ(at(0, 1000, 1000), 0.0f);        // x 255 = x4: zero only at the very end
     EXPECT_EQ(at(0, 5000, 1000), 0.0f);
 }
 

@@ -31,9 +31,8 @@ TEST_F(Mix, PanModesSilenceOneSideByVoiceNumber) {
         bool left_heard;
         bool right_heard;
     };
-    const Case cases[] = {{1, 0, false, true}, {1, 1, true, false}, {1, 2, true, false},
-                          {1, 3, false, true}, {3, 0, false, true}, {3, 1, true, false},
-                          {3, 2, false, true}, {2, 3, true, true}};
+    const Case cases[] = {{1, 0, false, true}, {1, 1, true, false}, {1, 2, true, false}, {1, 3, false, true},
+                          {3, 0, false, true}, {3, 1, true, false}, {3, 2, false, true}, {2, 3, true, true}};
     for (const Case& c : cases) {
         song().mode = static_cast<int16_t>(c.mode);
         for (auto& v : player.nlist) v.active = 0;
@@ -173,7 +172,7 @@ TEST_F(Mix, GlobalPitchScalesTicksAndSteps) {
 TEST_F(Mix, SumsAboveFourClipToOne) {
     sample16(1, std::vector<int16_t>(64, 32767));
     sample16(2, std::vector<int16_t>(64, -32768));
-    song().globalvol = 256;  // x 4
+    song().globalvol = 256;    // x 4
     song().trackpan[0] = 256;  // x 2
     song().trackpan2[1] = 256;
     start_voice(0, 1, 1.0, 0);
@@ -214,7 +213,8 @@ struct SlotProbe : EffectProcessor {
         float first_send, last_send, gain_left, gain_right;
     };
     std::vector<Call> calls;
-    void run(int slot, int type, const float* send, float*, int frames, int control, float el, float er) override {
+    void run(int slot, int type, const float* send, float*, int frames, int control, float el,
+             float er) override {
         calls.push_back({slot, type, control, send[0], send[frames - 1], el, er});
     }
 };
@@ -226,7 +226,7 @@ TEST_F(Mix, RoutedVoicesFeedTheirSlotsSendBuffer) {
     sample8(1, std::vector<int8_t>(100, 64));
     song().tracke[0] = 11;  // echo: dry sound kept, send at the track's send level
     song().trackc[0] = 64;
-    song().tracke[1] = 1;   // FIR low pass: heard only through the filter
+    song().tracke[1] = 1;  // FIR low pass: heard only through the filter
     start_voice(0, 1, 1.0, 0);
     start_voice(1, 1, 1.0, 1);
     const auto out = render(8);
@@ -238,7 +238,7 @@ TEST_F(Mix, RoutedVoicesFeedTheirSlotsSendBuffer) {
     EXPECT_EQ(probe.calls[1].type, 11);
     EXPECT_EQ(probe.calls[1].control, 64);
     EXPECT_NEAR(probe.calls[1].last_send, 0.25f, kTol);  // 0.5 x 64 / 128
-    EXPECT_NEAR(left(out, 0), centred(64), kTol);  // only voice 0 is heard dry
+    EXPECT_NEAR(left(out, 0), centred(64), kTol);        // only voice 0 is heard dry
     // Once no voice writes a slot, its buffer is cleared.
     for (auto& v : player.nlist) v.active = 0;
     probe.calls.clear();

@@ -63,7 +63,8 @@ TEST_F(OfflineRender, TimeLimitIsExact) {
 TEST_F(OfflineRender, ASinkThatFailsStopsTheRender) {
     make_song(4, 64);
     int calls = 0;
-    const RenderEnd end = render_offline(mixer, player, {}, [&](const float*, int, double) { return ++calls < 3; });
+    const RenderEnd end =
+        render_offline(mixer, player, {}, [&](const float*, int, double) { return ++calls < 3; });
     EXPECT_EQ(end, RenderEnd::Aborted);
     EXPECT_EQ(calls, 3);
 }

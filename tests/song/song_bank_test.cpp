@@ -1,6 +1,6 @@
-#include <gtest/gtest.h>
-
 #include "song/song_bank.h"
+
+#include <gtest/gtest.h>
 
 namespace ondrel {
 namespace {
