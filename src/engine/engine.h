@@ -1,5 +1,7 @@
 #pragma once
 #include "playback/player.h"
+#include "render/effect_rack.h"
+#include "render/effect_units.h"
 #include "render/mixer.h"
 #include "song/alerts.h"
 #include "song/effect_slots.h"
@@ -12,7 +14,18 @@ namespace ondrel {
 class Engine {
 public:
     explicit Engine(AlertSink* alerts = nullptr)
-        : bank(alerts ? alerts : &alert_log), slots(), player(bank, slots), mixer(bank, slots, player) {}
+        : bank(alerts ? alerts : &alert_log),
+          slots(),
+          player(bank, slots),
+          mixer(bank, slots, player),
+          units(bank, slots),
+          rack(bank, slots, units, player) {
+        mixer.set_effects(&units);
+        player.units = &units;
+        // Echo lines for every unit at the song's lengths, so routing never waits on memory.
+        for (int u = 0; u < kEchoUnits; ++u)
+            slots.reserve_echo_line(u, bank.current().echolen[u], bank.structure_lock());
+    }
     Engine(const Engine&) = delete;
     Engine& operator=(const Engine&) = delete;
 
@@ -21,6 +34,8 @@ public:
     EffectSlots slots;
     Player player;
     Mixer mixer;
+    EffectUnits units;
+    EffectRack rack;
 };
 
 }  // namespace ondrel

@@ -288,30 +288,37 @@ void Player::silence_voices() {
 }
 
 void Player::stoppi(bool sound_only) {
-    if (tr.playing || tr.fplaytrack) {
+    const bool was_playing = tr.playing || tr.fplaytrack;
+    if (was_playing) {
         tr.playing = 0;
         tr.fplaytrack = 0;
         window_posts.push_back({kMsgActi});
-        if (audio_running.load()) {
-            // The audio thread owns the voices while it runs: ask it, and wait until it
-            // has done so, at most a few buffers.
-            const uint32_t ticket = stop_request_.fetch_add(1) + 1;
-            const auto deadline = std::chrono::steady_clock::now() + std::chrono::milliseconds(500);
-            while (stop_done_.load(std::memory_order_acquire) < ticket && audio_running.load() &&
-                   std::chrono::steady_clock::now() < deadline)
-                std::this_thread::sleep_for(std::chrono::milliseconds(1));
-            if (!audio_running.load()) silence_voices();
-        } else {
-            silence_voices();
-        }
+    }
+    if (audio_running.load()) {
+        // The voices and the effect units are the audio thread's while it runs: ask it,
+        // and wait until it has done so, at most a few buffers.
+        stop_silences_.store(was_playing, std::memory_order_relaxed);
+        const uint32_t ticket = stop_request_.fetch_add(1, std::memory_order_release) + 1;
+        const auto deadline = std::chrono::steady_clock::now() + std::chrono::milliseconds(500);
+        while (stop_done_.load(std::memory_order_acquire) < ticket && audio_running.load() &&
+               std::chrono::steady_clock::now() < deadline)
+            std::this_thread::sleep_for(std::chrono::milliseconds(1));
+        if (!audio_running.load()) stop_audio_side(was_playing);
+    } else {
+        stop_audio_side(was_playing);
     }
     status = sound_only ? kStatusSoundStopped : kStatusStopped;
+}
+
+void Player::stop_audio_side(bool silence) {
+    if (units) units->delefx();
+    if (silence) silence_voices();
 }
 
 void Player::service_audio_requests() {
     const uint32_t asked = stop_request_.load(std::memory_order_acquire);
     if (asked == stop_done_.load(std::memory_order_relaxed)) return;
-    silence_voices();
+    stop_audio_side(stop_silences_.load(std::memory_order_relaxed));
     stop_done_.store(asked, std::memory_order_release);
 }
 

@@ -17,6 +17,13 @@ inline constexpr uint32_t kMsgStop = fourcc("stop");
 inline constexpr uint32_t kMsgActi = fourcc("acti");
 inline constexpr uint32_t kMsgDoup = fourcc("doup");
 
+// The effect units, as stopping play clears them.
+class UnitReset {
+public:
+    virtual ~UnitReset() = default;
+    virtual void delefx() = 0;
+};
+
 // The sequencer and its state: transport, voice list, polyphony counters, MIDI sending.
 // gere_play runs on the audio thread; start, stop and the auditions on the window thread.
 class Player {
@@ -37,6 +44,7 @@ public:
     // Set by the audio driver while its callback may run: stopping then hands the voice
     // reset to the audio thread instead of doing it here.
     std::atomic<bool> audio_running{false};
+    UnitReset* units = nullptr;
 
     // One half-tick of the sequencer.
     void gere_play();
@@ -89,6 +97,8 @@ private:
     std::vector<uint64_t> visited_;            // a bit per position and row when watched
     void mark_visited();
     std::atomic<uint32_t> stop_request_{0};
+    std::atomic<bool> stop_silences_{false};
+    void stop_audio_side(bool silence);
     std::atomic<uint32_t> stop_done_{0};
 };
 

@@ -1,0 +1,34 @@
+#pragma once
+
+namespace ondrel {
+
+// Values this small become exact zeros, so that decaying feedback never reaches the slow
+// denormal range.
+inline float flush(float v) {
+    return (v > -1e-5f && v < 1e-5f) ? 0.0f : v;
+}
+
+// The one-pole low pass of the reverbs, bilinear form:
+// y = ((K - 1) y1 + (u + u1)) / (K + 1) with K = 44100 / (fc pi), the division taken
+// once per buffer as the two coefficients below.
+struct OnePoleCoefficients {
+    float feedback;  // (K - 1) / (K + 1)
+    float gain;      // 1 / (K + 1)
+    static OnePoleCoefficients for_cutoff(float fc) {
+        const float k = 44100.0f / (fc * 3.1415927f);
+        return {(k - 1.0f) / (k + 1.0f), 1.0f / (k + 1.0f)};
+    }
+};
+
+struct OnePole {
+    float y1 = 0;
+    float u1 = 0;
+    float step(float u, const OnePoleCoefficients& c) {
+        const float y = flush(c.feedback * y1 + c.gain * (u + u1));
+        y1 = y;
+        u1 = u;
+        return y;
+    }
+};
+
+}  // namespace ondrel

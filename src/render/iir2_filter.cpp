@@ -1,0 +1,50 @@
+#include "render/iir2_filter.h"
+
+#include <cmath>
+
+#include "render/denormal.h"
+
+namespace ondrel {
+
+void Iir2Filter::clear() {
+    for (auto* rows : {&tournex, &tourney, &tournex2, &tourney2})
+        for (auto& r : *rows) r.fill(0.0f);
+}
+
+void Iir2Filter::run(int type, int slot, const float* send, float* out, int frames, int control, int q,
+                     float gain_left, float gain_right) {
+    const bool high = type == 17;
+    int& next_row = high ? row17_ : row16_;
+    if (next_row >= kRows || slot < 0 || slot >= 100) return;
+    auto& x = (high ? tournex2 : tournex)[next_row];
+    auto& y = (high ? tourney2 : tourney)[next_row];
+    ++next_row;
+
+    double fc = control * 0.00390625 * 22040;
+    if (fc == 0) fc = 100;
+    const double w = 1.0 / std::tan(M_PI * fc / 44100.0);
+    const double a = q * w * w;
+    const double d = a + q + 2 * w;
+    const float a0 = static_cast<float>(q / d);
+    const float b1 = static_cast<float>((a - q) / d);
+    const float b2 = static_cast<float>((a + q - 2 * w) / d);
+    int r = lesind[slot] & 1;
+    for (int i = 0; i < frames; ++i) {
+        const float s = send[i];
+        x[r] = s;
+        const float x1 = x[r ^ 1];
+        const float y1 = y[r];
+        const float y2 = y[r ^ 1];
+        // Only two history entries: the feed-forward part is 2 a0 (x + x1), computed in
+        // this order.
+        const float v = flush(a0 * x1 + 2 * a0 * s + 2 * b1 * y1 + (a0 * x1 - b2 * y2));
+        y[r ^ 1] = v;
+        r ^= 1;
+        const float o = high ? s - v : v;
+        out[2 * i] += o * gain_left;
+        out[2 * i + 1] += o * gain_right;
+    }
+    lesind[slot] = static_cast<int16_t>(r);
+}
+
+}  // namespace ondrel

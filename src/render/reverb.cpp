@@ -1,0 +1,97 @@
+#include "render/reverb.h"
+
+#include <algorithm>
+#include <new>
+
+namespace ondrel {
+
+uint16_t reverb_frames(uint32_t microseconds, uint32_t limit) {
+    uint64_t frames = uint64_t{microseconds} * 441 / 10000;
+    if (frames <= 3) frames = 4;
+    return static_cast<uint16_t>(std::min<uint64_t>(frames, limit));
+}
+
+Reverb::Reverb() {
+    for (int k = 0; k < kLines; ++k) {
+        const uint32_t floats = k == 6 ? kLongLineFloats : kShortLineFloats;
+        line_[k].reset(new (std::nothrow) float[floats]());
+        if (!line_[k]) return;
+    }
+    ok_ = true;
+}
+
+void Reverb::set_delay_us(int line, uint32_t microseconds) {
+    if (line < 0 || line >= kLines) return;
+    length_[line] = reverb_frames(microseconds, line == 6 ? 44099 : 11049);
+}
+
+void Reverb::set_gain(int field, int thousandths) {
+    const float g = thousandths / 1000.0f;
+    if (field >= 0 && field < 4) feedback_[field] = g;
+    if (field == 4 || field == 5) allpass_[field - 4] = g;
+    if (field == 6) output_gain_ = g;
+}
+
+float Reverb::gain(int field) const {
+    if (field >= 0 && field < 4) return feedback_[field];
+    if (field == 4 || field == 5) return allpass_[field - 4];
+    return output_gain_;
+}
+
+void Reverb::set_cutoff(int comb, float hz) {
+    if (comb >= 0 && comb < 4) cutoff_[comb] = std::clamp(hz, 10.0f, 11050.0f);
+}
+
+void Reverb::compute(const float* in, float* out, long frames, float gain_left, float gain_right) {
+    if (!ok_) return;
+    std::array<OnePoleCoefficients, 4> k{};
+    for (int c = 0; c < 4; ++c) k[c] = OnePoleCoefficients::for_cutoff(cutoff_[c]);
+    std::array<float*, kLines> base{};
+    for (int l = 0; l < kLines; ++l) {
+        base[l] = line_[l].get();
+        if (cursor_[l] >= length_[l]) cursor_[l] = 0;
+    }
+    const float g1 = allpass_[0], g2 = allpass_[1];
+    long done = 0;
+    while (done < frames) {
+        // Blocks end where the first line wraps, so the loop below never tests for it.
+        long block = frames - done;
+        for (int l = 0; l < kLines; ++l) block = std::min<long>(block, length_[l] - cursor_[l]);
+        std::array<float*, kLines> p{};
+        for (int l = 0; l < kLines; ++l) p[l] = base[l] + cursor_[l];
+        for (long i = 0; i < block; ++i) {
+            const float x = flush(in[done + i]);
+            float sum = 0;
+            for (int c = 0; c < 4; ++c) {
+                float& cell = p[c][i];
+                const float d = flush(cell);
+                const float y = lowpass_[c].step(d, k[c]);
+                cell = y * feedback_[c] + x;
+                sum += d;
+            }
+            float& a1 = p[4][i];
+            const float z1 = flush(a1);
+            const float w1 = flush(sum + g1 * z1);
+            const float out1 = z1 - g1 * w1;
+            a1 = w1;
+            float& a2 = p[5][i];
+            const float z2 = flush(a2);
+            const float w2 = flush(g2 * z2 + out1);
+            const float out2 = z2 - g2 * w2;
+            a2 = w2;
+            float& delay = p[6][i];
+            const float y = flush(delay);
+            delay = out2 * output_gain_;
+            out[2 * (done + i)] += y * gain_left;
+            out[2 * (done + i) + 1] -= y * gain_right;
+        }
+        done += block;
+        for (int l = 0; l < kLines; ++l) {
+            uint32_t& c = cursor_[l];
+            c += static_cast<uint32_t>(block);
+            if (c >= length_[l]) c = 0;
+        }
+    }
+}
+
+}  // namespace ondrel
