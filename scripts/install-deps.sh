@@ -6,7 +6,7 @@ set -euo pipefail
 packages=(
   build-essential cmake pkg-config python3
   libgtest-dev zlib1g-dev
-  libsdl2-dev
+  libsdl2-dev libmagic-dev
 )
 
 missing=()

@@ -2,13 +2,37 @@
 
 #include <unistd.h>
 
+#include <filesystem>
 #include <iostream>
 
 #include "import/loader.h"
+#include "import/sound_reader.h"
+#include "platform/mime_type.h"
 
 namespace ondrel {
 
+FileClass classify(const std::string& path) {
+    switch (returntype(path, mime_type_of(path))) {
+        case kSoundFile: return FileClass::Sound;
+        case kModuleFile: return FileClass::Song;
+        default: return FileClass::Other;
+    }
+}
+
 bool load_for_cli(Engine& engine, const std::string& path) {
+    if (!std::filesystem::exists(path)) {
+        std::cerr << "ondrel: cannot open " << path << ": No such file or directory\n";
+        return false;
+    }
+    const FileClass kind = classify(path);
+    if (kind == FileClass::Sound) {
+        std::cerr << "ondrel: " << path << " is a sound, not a song (see 'ondrel set-sound')\n";
+        return false;
+    }
+    if (kind == FileClass::Other) {
+        std::cerr << "ondrel: " << path << ": I don't use this file\n";
+        return false;
+    }
     const LoadResult r = load(path, engine.bank, engine.slots);
     if (!r.ok) {
         std::cerr << "ondrel: " << r.error << "\n";

@@ -5,8 +5,13 @@
 
 namespace ondrel {
 
-// Loads path into the engine's current song; on failure prints one line and returns
-// false. A file that ends early loads with a warning.
+enum class FileClass { Song, Sound, Other };
+
+// What a file is, as the program sorts dropped files: by extension and content type.
+FileClass classify(const std::string& path);
+
+// Loads a module into the engine's current song; on failure prints one line and returns
+// false. A file that ends early loads with a warning. Sounds and other files are refused.
 bool load_for_cli(Engine& engine, const std::string& path);
 
 // True when the stream is a terminal (progress and status lines go there only).

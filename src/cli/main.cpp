@@ -15,10 +15,12 @@ const Command kCommands[] = {
     {"play", "play FILE [OPTIONS]     play a song on the sound card, with a status line", ondrel::cmd_play},
     {"render", "render FILE -o OUT     render a song to a WAV file, faster than real time",
      ondrel::cmd_render},
-    {"info", "info [--json] FILE     show a module: tempo, sequence, patterns, samples, effects",
+    {"info", "info [--json] FILE     show a module (tempo, sequence, patterns, samples) or a sound",
      ondrel::cmd_info},
     {"convert", "convert FILE -o OUT    save any module the program reads as a .otm module",
      ondrel::cmd_convert},
+    {"set-sound", "set-sound SONG SLOT SOUND -o OUT   put a WAV/AIFF/AVR sound into a song's slot",
+     ondrel::cmd_set_sound},
 };
 
 void usage(std::ostream& out) {

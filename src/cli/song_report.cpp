@@ -44,7 +44,7 @@ void pattern_json(JsonWriter& j, int index, const Pattern& p, int rows) {
     j.end_object();
 }
 
-void sample_json(JsonWriter& j, int index, const p_s& s) {
+void sample_fields(JsonWriter& j, int index, const p_s& s) {
     j.begin_object();
     j.field("index", index);
     j.field("name", std::string(s.name));
@@ -68,6 +68,28 @@ void sample_json(JsonWriter& j, int index, const p_s& s) {
 }
 
 }  // namespace
+
+std::string sample_json(const p_s& s, int index) {
+    JsonWriter j;
+    sample_fields(j, index, s);
+    return j.out + "\n";
+}
+
+std::string sample_text(const p_s& s) {
+    std::ostringstream o;
+    o << "Name:         " << s.name << "\n";
+    o << "Rate:         " << s.rate << " Hz\n";
+    o << "Format:       " << s.bits << "-bit " << (s.stereo ? "stereo" : "mono") << "\n";
+    o << "Length:       " << s.length << " bytes, " << s.frames() << " frames\n";
+    if (s.loopon)
+        o << "Loop:         bytes " << s.loopstart << " to " << s.loopend << "\n";
+    else
+        o << "Loop:         none\n";
+    o << "Volume:       " << s.volume << "\n";
+    o << "Base note:    " << s.refnote << "\n";
+    o << "From:         " << s.source_path << "\n";
+    return o.str();
+}
 
 std::string song_json(const SongBank& bank, int song) {
     const TMOD& m = *bank.timod[song];
@@ -98,7 +120,7 @@ std::string song_json(const SongBank& bank, int song) {
     j.key("samples");
     j.begin_array();
     for (int i = 0; i < kSamplesPerSong; ++i)
-        if (const p_s* s = bank.sample(m.sndbase + i)) sample_json(j, i + 1, *s);
+        if (const p_s* s = bank.sample(m.sndbase + i)) sample_fields(j, i + 1, *s);
     j.end_array();
     j.key("efx");
     j.begin_object();

@@ -53,7 +53,8 @@ int16_t frame_code(int bits, bool stereo) {
 
 void bound_loop(p_s& s) {
     s.loopend = std::min(s.loopend, s.length);
-    s.loopstart = std::min(s.loopstart, s.loopend);
+    s.loopstart = std::min(s.loopstart, s.length);
+    if (s.loopon && s.loopstart > s.loopend) s.loopstart = s.loopend;
 }
 
 void set_sample_name(p_s& s, const char* text, size_t max_len) {
@@ -74,6 +75,7 @@ void bound_sample(p_s& s) {
     if (s.refnote < 0) s.refnote = 0;
     if (s.refnote > 127) s.refnote = 127;
     s.name[sizeof s.name - 1] = 0;
+    s.source_path[sizeof s.source_path - 1] = 0;
     bound_loop(s);
 }
 

@@ -37,6 +37,13 @@ struct p_s {
     int16_t finetune;
     uint32_t setting;
     uint16_t flag;
+    // Kept from an imported sound file: where its data began, the importer's default
+    // words, half its rate, and the file it came from.
+    uint32_t source_offset;
+    uint16_t default_words[4];
+    uint32_t halfrate;
+    uint16_t trailing;
+    char source_path[256];
 
     uint16_t& env(int kind, int point) { return envelope[point * kEnvelopeKinds + kind]; }
     uint16_t env(int kind, int point) const { return envelope[point * kEnvelopeKinds + kind]; }
@@ -59,7 +66,7 @@ void Raz_data(p_s& s);
 int16_t frame_code(int bits, bool stereo);
 
 // Keeps loop points inside the data so that no reader can hand the mixer a loop that
-// runs past the allocation.
+// runs past the allocation; a loop that is off keeps its points as stored.
 void bound_loop(p_s& s);
 
 // Copies a name into the record, NUL-terminated, cut to what fits.

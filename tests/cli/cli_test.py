@@ -151,6 +151,36 @@ with tempfile.TemporaryDirectory() as tmp:
     check("no device exits 3", r.returncode == 3, (r.returncode, r.stderr))
     check("no device says render", "render" in r.stderr and r.stderr.count("\n") == 1, r.stderr)
 
+# Sounds: the record a file becomes, and a song built from a script.
+SOUNDS = os.path.normpath(os.path.join(os.getcwd(), "..", "shared", "corpus", "sound"))
+wav_path = os.path.join(SOUNDS, "buzz.wav")
+if os.path.exists(wav_path):
+    r = run("info", "--json", wav_path)
+    check("sound info exit", r.returncode == 0, r.stderr)
+    sound = json.loads(r.stdout)
+    check("sound keys", set(sound) == SAMPLE_KEYS, sorted(set(sound) ^ SAMPLE_KEYS))
+    check("sound named after its file", sound["name"] == "buzz", sound["name"])
+    check("sound rate", sound["rate"] == 22050)
+    with tempfile.TemporaryDirectory() as tmp:
+        out = os.path.join(tmp, "with-buzz.otm")
+        r = run("set-sound", DEMO, "7", wav_path, "-o", out)
+        check("set-sound exit", r.returncode == 0, r.stderr)
+        song = json_report(out)
+        slot7 = [x for x in song["samples"] if x["index"] == 7]
+        check("slot 7 holds the sound", slot7 and slot7[0]["name"] == "buzz" and slot7[0]["crc32"] == sound["crc32"],
+              slot7)
+        check("the rest of the song stays", len(song["samples"]) == 7 and song["name"] == "Ondrel Morning")
+        check("set-sound bad slot", run("set-sound", DEMO, "0", wav_path, "-o", out).returncode == 2)
+        text = os.path.join(tmp, "notes.txt")
+        with open(text, "w") as f:
+            f.write("hello\n" * 200)
+        r = run("set-sound", DEMO, "1", text, "-o", out)
+        check("set-sound refuses other files", r.returncode == 1 and "I don't use this file" in r.stderr, r.stderr)
+        r = run("info", text)
+        check("info refuses other files", r.returncode == 1 and "I don't use this file" in r.stderr, r.stderr)
+else:
+    print("corpus sounds not here: sound checks skipped")
+
 # Usage errors exit 2; help exits 0.
 check("no command", run().returncode == 2)
 check("unknown command", run("frobnicate").returncode == 2)
