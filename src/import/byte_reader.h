@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <cstring>
 #include <span>
+#include <vector>
 
 namespace ondrel {
 
@@ -12,6 +13,8 @@ class ByteReader {
 public:
     ByteReader() = default;
     explicit ByteReader(std::span<const uint8_t> bytes) : data_(bytes) {}
+    // The reader only looks at the bytes: they must outlive it.
+    explicit ByteReader(std::vector<uint8_t>&&) = delete;
 
     size_t size() const { return data_.size(); }
     size_t tell() const { return pos_; }

@@ -109,7 +109,8 @@ TEST(SoundReader, WavWithoutDataOrWithTooManyBitsIsRefused) {
     std::string why;
     EXPECT_FALSE(read_sound(r, SoundKind::Wav, "x.wav", "x.wav", s, why));
     EXPECT_NE(why.find("data"), std::string::npos);
-    ByteReader r24(wav(1, 8000, 24, {0, 0, 0}));
+    const auto wav24 = wav(1, 8000, 24, {0, 0, 0});
+    ByteReader r24(wav24);
     EXPECT_FALSE(read_sound(r24, SoundKind::Wav, "x.wav", "x.wav", s, why));
     EXPECT_EQ(s, nullptr);
 }
