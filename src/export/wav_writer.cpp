@@ -85,10 +85,10 @@ bool WavWriter::write(const float* samples, size_t frames) {
             const float x = std::clamp(samples[done + i], -1.0f, 1.0f);
             switch (format_) {
                 case WavSampleFormat::Pcm8:
-                    buffer[i] = static_cast<uint8_t>(std::lround(x * 127.0f) + 128);
+                    buffer[i] = static_cast<uint8_t>(std::lrintf(x * 127.0f) + 128);
                     break;
                 case WavSampleFormat::Pcm16: {
-                    const int16_t v = static_cast<int16_t>(std::lround(x * 32767.0f));
+                    const int16_t v = static_cast<int16_t>(std::lrintf(x * 32767.0f));
                     buffer[2 * i] = static_cast<uint8_t>(v & 0xff);
                     buffer[2 * i + 1] = static_cast<uint8_t>((v >> 8) & 0xff);
                     break;

@@ -233,7 +233,7 @@ void Player::trigger(int t, Voice& v, int note) {
                     static_cast<uint8_t>(std::min(volume * 127 / 128, 127)), now);
         tr.notesended[t] = static_cast<int16_t>(note + 1);
     } else {
-        v.active = 1;
+        activate(static_cast<int>(&v - nlist.data()));
     }
     v.period = v.baseperiod = finetune_factor(v.finetune) * floatnote()[note];
     v.keyoff = 0;

@@ -33,6 +33,13 @@ public:
     Transport tr;
     EditCursor cursor;
     std::array<Voice, kVoices> nlist{};
+    // A bit per voice that may be active, so the mixer need not look at all 256: set when
+    // a voice starts, cleared by the mixer when it finds the voice stopped.
+    std::array<uint64_t, kVoices / 64> active_hint{};
+    void activate(int voice) {
+        nlist[voice].active = 1;
+        active_hint[voice / 64] |= uint64_t{1} << (voice % 64);
+    }
     std::array<int16_t, kVoices> polytotrack{};
     std::array<int16_t, kVoices> polytour{};
     std::array<int16_t, kTracks> efxaffiche{};

@@ -12,6 +12,7 @@ void DelayUnits::echo(EffectSlots& slots, int k, uint32_t delay, uint32_t feedba
     const uint32_t capacity = slots.sizeecho[k] / 4;
     if (!line || delay == 0) return;  // no memory, no unit
     const uint32_t d = std::min(delay, capacity);
+    used[k] = true;
     const float g = feedback / 128.0f;
     const float right_sign = invert ? -1.0f : 1.0f;
     uint32_t& cursor = pechoefx[k];
@@ -56,6 +57,8 @@ void DelayUnits::stereo_space(int k, const float* send, float* out, int frames) 
 
 void DelayUnits::clear(EffectSlots& slots) {
     for (int k = 0; k < kEchoUnits; ++k) {
+        if (!used[k]) continue;  // a line never run holds nothing to clear
+        used[k] = false;
         if (float* line = slots.echoefx[k].get()) std::memset(line, 0, slots.sizeecho[k]);
         pechoefx[k] = 0;
     }

@@ -20,6 +20,7 @@ public:
     void clear(EffectSlots& slots);
 
     std::array<uint32_t, kEchoUnits> pechoefx{};  // cursors, in floats from the line start
+    std::array<bool, kEchoUnits> used{};          // lines written since they were last cleared
     std::array<std::array<float, kStereoSpaceFrames>, kEchoUnits> echoste{};
     std::array<uint32_t, kEchoUnits> pechoste{};
 };

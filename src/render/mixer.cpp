@@ -6,6 +6,7 @@
 
 #include "playback/tables.h"
 #include "render/pan_table.h"
+#include "render/output_clip.h"
 #include "render/voice_mix.h"
 
 namespace ondrel {
@@ -100,8 +101,18 @@ void Mixer::number_routed_slots(const TMOD& m) {
 
 void Mixer::render_piece(float* out, int c0, int n, const TMOD& m, double frame_rate) {
     number_routed_slots(m);
-    for (int vi = 0; vi < kVoices; ++vi)
-        if (player_.nlist[vi].active) render_voice(vi, out, c0, n, m, frame_rate);
+    // In index order: the order decides which voice sets a slot's control value.
+    for (int w = 0; w < kVoices / 64; ++w) {
+        uint64_t& hint = player_.active_hint[w];
+        for (uint64_t bits = hint; bits; bits &= bits - 1) {
+            const int b = __builtin_ctzll(bits);
+            const int vi = w * 64 + b;
+            if (player_.nlist[vi].active)
+                render_voice(vi, out, c0, n, m, frame_rate);
+            else
+                hint &= ~(uint64_t{1} << b);
+        }
+    }
 }
 
 void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, double frame_rate) {
@@ -239,7 +250,7 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
         const int cnt = static_cast<int>(count);
         double x = f;
         if (muted) {
-            x += step * cnt;
+            x = f + cnt * step;
         } else if (stereo) {
             x = stereo_mixer(bits16)(s->data, pos, x, step, cnt, o, gains);
         } else {
@@ -295,17 +306,9 @@ void Mixer::effect_stage(float* out, int frames, TMOD& m) {
 }
 
 void Mixer::output_stage(float* out, int frames, const AudioFormat& format) {
-    float lpeak = 0, rpeak = 0;
-    for (int i = 0; i < frames; ++i) {
-        const float l = std::clamp(out[2 * i] * 0.25f, -1.0f, 1.0f);
-        const float r = std::clamp(out[2 * i + 1] * 0.25f, -1.0f, 1.0f);
-        out[2 * i] = l;
-        out[2 * i + 1] = r;
-        lpeak = std::max(lpeak, std::fabs(l));
-        rpeak = std::max(rpeak, std::fabs(r));
-    }
-    lmax.store(lpeak, std::memory_order_relaxed);
-    rmax.store(rpeak, std::memory_order_relaxed);
+    const Peaks peaks = headroom_and_clip(out, frames);
+    lmax.store(peaks.left, std::memory_order_relaxed);
+    rmax.store(peaks.right, std::memory_order_relaxed);
     if (f_fftmode.load(std::memory_order_relaxed) == 1)
         for (int i = 0; i < std::min(frames, 512); ++i)
             Bufferfft1[i].store(static_cast<double>(out[2 * i + 1] * 0.5f + out[2 * i] * 0.5f),

@@ -15,8 +15,8 @@ struct MixGains {
     float send;
 };
 
-// Mixes count frames of a mono sample starting at frame pos, offset x (grows by step),
-// into interleaved out and the mono send buffer; returns the final x.
+// Mixes count frames of a mono sample from frame pos, frame i read at offset f + i x step,
+// into interleaved out and the mono send buffer; returns the offset after the last frame.
 using MonoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count, float* out,
                              float* send, const MixGains& g);
 // Stereo samples are never interpolated and never sent.

@@ -46,7 +46,7 @@ protected:
     Voice& start_voice(int voice, int instrument, double step = 1.0, int track = 0) {
         if (p_s* s = engine.bank.song_sample(instrument - 1)) s->rate = static_cast<uint32_t>(44100 * step);
         Voice& v = player.nlist[voice];
-        v.active = 1;
+        player.activate(voice);
         v.instrument = static_cast<uint16_t>(instrument);
         v.volume = 128;
         v.period = floatnote()[48];

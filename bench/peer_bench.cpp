@@ -1,0 +1,145 @@
+// Renders every corpus module to memory with our engine ("Interpolation" on) and, in the
+// same run, with two other players used only as yardsticks (linear interpolation both),
+// and prints each one's speed in times real time, median of several runs.
+#include <libopenmpt/libopenmpt.h>
+#include <xmp.h>
+
+#include <algorithm>
+#include <chrono>
+#include <cstdio>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "engine/engine.h"
+#include "import/loader.h"
+#include "render/offline_render.h"
+
+namespace {
+
+using Clock = std::chrono::steady_clock;
+constexpr int kRate = 44100;
+constexpr int kFrames = 1024;
+constexpr double kMaxSeconds = 600;
+
+struct Run {
+    double audio_seconds = 0;
+    double work_seconds = 0;
+    double x() const { return work_seconds > 0 ? audio_seconds / work_seconds : 0; }
+};
+
+// Times one render; the median of runs.
+Run median_of(int runs, const std::function<Run()>& render) {
+    std::vector<Run> all;
+    for (int i = 0; i < runs; ++i) all.push_back(render());
+    std::sort(all.begin(), all.end(), [](const Run& a, const Run& b) { return a.x() < b.x(); });
+    return all[all.size() / 2];
+}
+
+Run ours(const std::string& path) {
+    ondrel::Engine engine;
+    Run r;
+    if (!ondrel::load(path, engine.bank, engine.slots).ok) return r;
+    engine.mixer.qual = 1;
+    uint64_t frames = 0;
+    const auto start = Clock::now();
+    ondrel::render_offline(engine.mixer, engine.player, {kFrames, kMaxSeconds}, [&](const float*, int n, double) {
+        frames += static_cast<uint64_t>(n);
+        return true;
+    });
+    r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
+    r.audio_seconds = static_cast<double>(frames) / kRate;
+    return r;
+}
+
+Run openmpt(const std::vector<char>& data) {
+    Run r;
+    openmpt_module* mod =
+        openmpt_module_create_from_memory2(data.data(), data.size(), nullptr, nullptr, nullptr, nullptr, nullptr,
+                                           nullptr, nullptr);
+    if (!mod) return r;
+    openmpt_module_set_render_param(mod, OPENMPT_MODULE_RENDER_INTERPOLATIONFILTER_LENGTH, 2);
+    std::vector<float> buffer(2 * kFrames);
+    uint64_t frames = 0;
+    const auto start = Clock::now();
+    while (frames < kMaxSeconds * kRate) {
+        const size_t n = openmpt_module_read_interleaved_float_stereo(mod, kRate, kFrames, buffer.data());
+        if (n == 0) break;
+        frames += n;
+    }
+    r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
+    r.audio_seconds = static_cast<double>(frames) / kRate;
+    openmpt_module_destroy(mod);
+    return r;
+}
+
+Run libxmp(const std::vector<char>& data) {
+    Run r;
+    xmp_context ctx = xmp_create_context();
+    if (xmp_load_module_from_memory(ctx, data.data(), static_cast<long>(data.size())) != 0) {
+        xmp_free_context(ctx);
+        return r;
+    }
+    xmp_start_player(ctx, kRate, 0);
+    xmp_set_player(ctx, XMP_PLAYER_INTERP, XMP_INTERP_LINEAR);
+    std::vector<int16_t> buffer(2 * kFrames);
+    uint64_t frames = 0;
+    const auto start = Clock::now();
+    while (frames < kMaxSeconds * kRate) {
+        if (xmp_play_buffer(ctx, buffer.data(), static_cast<int>(buffer.size() * 2), 1) != 0) break;
+        frames += kFrames;
+    }
+    r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
+    r.audio_seconds = static_cast<double>(frames) / kRate;
+    xmp_end_player(ctx);
+    xmp_release_module(ctx);
+    xmp_free_context(ctx);
+    return r;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    std::string corpus = "../shared/corpus";
+    int runs = 5;
+    for (int i = 1; i < argc; ++i) {
+        if (!std::strcmp(argv[i], "--runs") && i + 1 < argc) runs = std::max(1, std::atoi(argv[++i]));
+        else if (!std::strcmp(argv[i], "--corpus") && i + 1 < argc) corpus = argv[++i];
+        else {
+            std::fprintf(stderr, "usage: bench_peers [--runs N] [--corpus DIR]\n");
+            return 2;
+        }
+    }
+    std::vector<std::filesystem::path> files;
+    for (const char* folder : {"mod", "s3m", "mtm"}) {
+        const auto dir = std::filesystem::path(corpus) / folder;
+        if (!std::filesystem::exists(dir)) continue;
+        for (const auto& e : std::filesystem::directory_iterator(dir)) files.push_back(e.path());
+    }
+    std::sort(files.begin(), files.end());
+    if (files.empty()) {
+        std::fprintf(stderr, "bench_peers: no modules under %s\n", corpus.c_str());
+        return 1;
+    }
+    std::printf("%-36s %8s %9s %9s %9s %8s %8s\n", "module", "audio s", "ours x", "openmpt x", "xmp x", "/openmpt",
+                "/xmp");
+    double worst = 1e9;
+    for (const auto& path : files) {
+        std::ifstream in(path, std::ios::binary);
+        std::vector<char> data((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+        const Run a = median_of(runs, [&] { return ours(path.string()); });
+        const Run b = median_of(runs, [&] { return openmpt(data); });
+        const Run c = median_of(runs, [&] { return libxmp(data); });
+        const double vs_openmpt = b.x() > 0 ? a.x() / b.x() : 0;
+        const double vs_xmp = c.x() > 0 ? a.x() / c.x() : 0;
+        const double fastest_peer = std::max(b.x(), c.x());
+        if (fastest_peer > 0 && a.audio_seconds > 1) worst = std::min(worst, a.x() / fastest_peer);
+        std::printf("%-36s %8.1f %9.0f %9.0f %9.0f %8.2f %8.2f\n", path.filename().string().c_str(), a.audio_seconds,
+                    a.x(), b.x(), c.x(), vs_openmpt, vs_xmp);
+    }
+    std::printf("\nslowest ratio of ours to the faster peer (modules over 1 s): %.2f\n", worst);
+    return 0;
+}

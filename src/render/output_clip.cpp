@@ -1,0 +1,50 @@
+#include "render/output_clip.h"
+
+#include <immintrin.h>
+
+#include <algorithm>
+#include <cmath>
+
+namespace ondrel {
+
+namespace {
+
+Peaks clip_frames(float* out, int from, int frames, Peaks p) {
+    for (int i = from; i < frames; ++i) {
+        const float l = std::min(std::max(out[2 * i] * 0.25f, -1.0f), 1.0f);
+        const float r = std::min(std::max(out[2 * i + 1] * 0.25f, -1.0f), 1.0f);
+        out[2 * i] = l;
+        out[2 * i + 1] = r;
+        p.left = std::max(p.left, std::fabs(l));
+        p.right = std::max(p.right, std::fabs(r));
+    }
+    return p;
+}
+
+__attribute__((target("avx2"))) Peaks clip_avx2(float* out, int frames) {
+    const __m256 quarter = _mm256_set1_ps(0.25f);
+    const __m256 one = _mm256_set1_ps(1.0f);
+    const __m256 minus_one = _mm256_set1_ps(-1.0f);
+    const __m256 magnitude = _mm256_castsi256_ps(_mm256_set1_epi32(0x7fffffff));
+    __m256 peak = _mm256_setzero_ps();
+    int i = 0;
+    for (; i + 4 <= frames; i += 4) {  // four stereo frames a vector: L R L R L R L R
+        __m256 v = _mm256_mul_ps(_mm256_loadu_ps(out + 2 * i), quarter);
+        v = _mm256_min_ps(_mm256_max_ps(v, minus_one), one);
+        _mm256_storeu_ps(out + 2 * i, v);
+        peak = _mm256_max_ps(peak, _mm256_and_ps(v, magnitude));
+    }
+    alignas(32) float lanes[8];
+    _mm256_store_ps(lanes, peak);
+    Peaks p{std::max({lanes[0], lanes[2], lanes[4], lanes[6]}), std::max({lanes[1], lanes[3], lanes[5], lanes[7]})};
+    return clip_frames(out, i, frames, p);
+}
+
+}  // namespace
+
+Peaks headroom_and_clip(float* out, int frames) {
+    static const bool avx2 = __builtin_cpu_supports("avx2");
+    return avx2 ? clip_avx2(out, frames) : clip_frames(out, 0, frames, {0, 0});
+}
+
+}  // namespace ondrel
