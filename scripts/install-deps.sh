@@ -7,6 +7,7 @@ packages=(
   build-essential cmake pkg-config python3
   libgtest-dev zlib1g-dev
   libsdl2-dev libmagic-dev
+  clang libclang-rt-dev
 )
 
 missing=()

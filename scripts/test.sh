@@ -1,5 +1,6 @@
 #!/usr/bin/env bash
-# Builds and runs every test: a normal build, then the same suite under ASan+UBSan.
+# Builds and runs every test: a normal build, then the same suite under ASan+UBSan and
+# under ThreadSanitizer.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 scripts/install-deps.sh
@@ -9,6 +10,11 @@ scripts/build.sh build -DONDREL_TESTS=ON -DONDREL_WERROR=ON
 (cd build && ctest --output-on-failure -j "$(nproc)")
 
 echo "== build and test under ASan+UBSan"
-BUILD_TYPE=Debug scripts/build.sh build-asan -DONDREL_TESTS=ON -DONDREL_SANITIZE=address -DONDREL_WERROR=ON
+BUILD_TYPE=Debug scripts/build.sh build-asan -DONDREL_TESTS=ON -DONDREL_BENCH=OFF -DONDREL_SANITIZE=address \
+  -DONDREL_WERROR=ON
 (cd build-asan && ASAN_OPTIONS=detect_leaks=1:abort_on_error=1 UBSAN_OPTIONS=print_stacktrace=1 \
    ctest --output-on-failure -j "$(nproc)")
+
+echo "== build and test under ThreadSanitizer"
+scripts/build.sh build-tsan -DONDREL_TESTS=ON -DONDREL_BENCH=OFF -DONDREL_SANITIZE=thread -DONDREL_WERROR=ON
+(cd build-tsan && TSAN_OPTIONS=halt_on_error=1 ctest --output-on-failure -j "$(nproc)")

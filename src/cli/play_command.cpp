@@ -92,10 +92,7 @@ int cmd_play(const Args& args) {
     std::signal(SIGTERM, on_interrupt);
     const bool status = is_terminal(2);
     TerminalKeys keys;
-    {
-        std::lock_guard<StructureLock> guard(output);
-        player.start(false);
-    }
+    player.start(false);
     const auto started = std::chrono::steady_clock::now();
     const char* ended = "the end of the song";
     for (;;) {

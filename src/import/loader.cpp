@@ -70,10 +70,13 @@ LoadResult load(const std::string& path, SongBank& bank, EffectSlots& slots) {
     }
 
     ModuleRead read;
-    if (bank.fmulload)
+    if (bank.fmulload) {
         read.song.mod = bank.default_record(bank.nbimod);
-    else
+    } else {
+        // The sequencer may be writing the playing song's record: copy it between buffers.
+        std::lock_guard<StructureLock> guard(bank.structure_lock());
         *read.song.mod = bank.current();
+    }
     ByteReader file(bytes);
     if (!reader.read(file, read)) {
         result.error = path + ": " + read.error;

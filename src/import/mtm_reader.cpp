@@ -34,7 +34,8 @@ void read_sample(ByteReader& file, const uint8_t* h, ModuleRead& out, int index)
     const uint8_t finetune = r.u8();
     const int8_t volume = r.s8();
     const bool bits16 = r.u8() & 1;
-    const uint32_t length = std::min(wanted, kMaxSampleBytes);
+    // Sized by what the file can hold, never by what a header claims.
+    const uint32_t length = static_cast<uint32_t>(std::min<uint64_t>({wanted, kMaxSampleBytes, file.remaining()}));
     SampleRef s = make_sample(length);
     set_sample_name(*s, name[0] ? name : "None", 22);
     s->rate = 8363;
@@ -85,8 +86,14 @@ bool read_mtm(ByteReader& file, ModuleRead& out) {
     std::vector<uint8_t> headers(kSampleHeader * static_cast<size_t>(samples));
     file.read(headers.data(), headers.size());
     file.read(m.sequence, 128);
-    std::vector<uint8_t> tracks(kTrackBytes * static_cast<size_t>(stored_tracks));
-    if (file.read(tracks.data(), tracks.size()) < tracks.size()) out.truncated = true;
+    const size_t track_bytes = kTrackBytes * static_cast<size_t>(stored_tracks);
+    const size_t kept = std::min(track_bytes, file.remaining());
+    std::vector<uint8_t> tracks(kept);
+    file.read(tracks.data(), kept);
+    if (kept < track_bytes) {
+        out.truncated = true;
+        file.skip(track_bytes - kept);
+    }
     std::vector<uint8_t> table(64 * static_cast<size_t>(patterns));
     if (file.read(table.data(), table.size()) < table.size()) out.truncated = true;
     // The comment is text for people; the song has no place for it.
@@ -97,7 +104,8 @@ bool read_mtm(ByteReader& file, ModuleRead& out) {
         for (int c = 0; c < m.nbtrack; ++c) {
             const uint8_t* entry = &table[64 * static_cast<size_t>(p) + 2 * static_cast<size_t>(c)];
             const int track = entry[0] | entry[1] << 8;
-            if (track == 0 || track > stored_tracks) continue;
+            // Tracks the file does not hold leave the column clear.
+            if (track == 0 || static_cast<size_t>(track) * kTrackBytes > tracks.size()) continue;
             const uint8_t* cells = &tracks[kTrackBytes * static_cast<size_t>(track - 1)];
             for (int r = 0; r < 64; ++r) pat->col[c][r] = mtm_cell(cells + 3 * r);
         }

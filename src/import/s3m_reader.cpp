@@ -146,7 +146,10 @@ void read_sample(ByteReader& file, const uint8_t* h, bool unsigned_data, ModuleR
     const uint32_t frame_bytes = (bits16 ? 2u : 1u) * (stereo ? 2u : 1u);
     // Adlib and empty instruments have no sample data.
     const uint64_t wanted = type == 1 ? uint64_t{frames} * frame_bytes : 0;
-    const uint32_t length = static_cast<uint32_t>(std::min<uint64_t>(wanted, kMaxSampleBytes));
+    // Sized by what the file can hold after the data's start, never by what a header claims.
+    const size_t data_at = size_t{memseg} * 16;
+    const uint64_t there = data_at < file.size() ? file.size() - data_at : 0;
+    const uint32_t length = static_cast<uint32_t>(std::min<uint64_t>({wanted, kMaxSampleBytes, there}));
     SampleRef s = make_sample(length);
     set_sample_name(*s, name[0] ? name : "None", 28);
     s->rate = rate;
@@ -156,7 +159,7 @@ void read_sample(ByteReader& file, const uint8_t* h, bool unsigned_data, ModuleR
     s->refnote = 48;
     if (length) {
         std::vector<uint8_t> raw(length);
-        file.seek(size_t{memseg} * 16);
+        file.seek(data_at);
         if (file.read(raw.data(), length) < length || length < wanted) out.truncated = true;
         const uint32_t sample_bytes = bits16 ? 2 : 1;
         const uint32_t channel_bytes = length / (stereo ? 2 : 1);
@@ -175,6 +178,7 @@ void read_sample(ByteReader& file, const uint8_t* h, bool unsigned_data, ModuleR
                 make_signed8(s->data, length);
         }
     }
+    if (length < wanted) out.truncated = true;
     s->loopon = (flags & 1) ? 1 : 0;
     s->loopstart = loop_start * frame_bytes;
     s->loopend = loop_end * frame_bytes;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <chrono>
+#include <mutex>
 #include <thread>
 
 #include "playback/effect_commands.h"
@@ -262,6 +263,7 @@ int Player::route_to_slot(int t, int slot) {
 }
 
 void Player::start(bool pattern_mode) {
+    std::lock_guard<StructureLock> guard(bank_.structure_lock());
     const TMOD& m = bank_.current();
     if (!tr.playing) {
         tr.nopos = cursor.poscurv.load();
@@ -323,6 +325,7 @@ void Player::service_audio_requests() {
 }
 
 void Player::audition_note(const TNOTE& cell, int track) {
+    std::lock_guard<StructureLock> guard(bank_.structure_lock());
     tr.afnote = cell;
     tr.aftrack = static_cast<int16_t>(track);
     tr.afpending.store(1, std::memory_order_release);

@@ -1,5 +1,6 @@
 #include "render/effect_rack.h"
 
+#include <algorithm>
 #include <mutex>
 
 namespace ondrel {
@@ -39,12 +40,20 @@ std::vector<std::pair<int, std::string>> EffectRack::list() const {
     return out;
 }
 
+std::array<uint16_t, kTracks> EffectRack::routing() {
+    // Command 33 rewrites the routing while a song plays: read it between buffers.
+    std::lock_guard<StructureLock> guard(bank_.structure_lock());
+    std::array<uint16_t, kTracks> words{};
+    std::copy(std::begin(bank_.current().tracke), std::end(bank_.current().tracke), words.begin());
+    return words;
+}
+
 bool EffectRack::checkbufferefx(int track, int slot) {
-    const TMOD& m = bank_.current();
+    const std::array<uint16_t, kTracks> tracke = routing();
     std::array<bool, kEffectSlots> seen{};
     int count = 0;
     for (int t = 0; t < kTracks; ++t) {
-        const int s = t == track ? slot : m.tracke[t];
+        const int s = t == track ? slot : tracke[t];
         if (s > 0 && s < kEffectSlots && !seen[s]) {
             seen[s] = true;
             ++count;
@@ -64,7 +73,7 @@ void EffectRack::route(int track, int slot) {
 
 int EffectRack::mnplusefx(int track) {
     if (track < 0 || track >= kTracks) return -1;
-    int s = bank_.current().tracke[track];
+    int s = routing()[track];
     for (int tries = 0; tries < kEffectSlots; ++tries) {
         s = s >= 99 ? 1 : s + 1;
         if (slots_.efxtype[s]) {
@@ -77,7 +86,7 @@ int EffectRack::mnplusefx(int track) {
 
 int EffectRack::mnmoinsefx(int track) {
     if (track < 0 || track >= kTracks) return -1;
-    int s = bank_.current().tracke[track] - 1;
+    int s = routing()[track] - 1;
     if (s < 0) s = 99;
     // From slot 0 the walk goes on at 98: slot 99 is reached only by starting there.
     for (int tries = 0; tries < 2 * kEffectSlots && !slots_.efxtype[s]; ++tries) s = s == 0 ? 98 : s - 1;
@@ -137,6 +146,7 @@ bool EffectRack::remove(int slot) {
 void EffectRack::aff_echo(int value) {
     if (shown_ <= 0 || shown_ >= kEffectSlots || slots_.efxtype[shown_] != 11) return;
     const int k = units_.instance_of(shown_);
+    std::lock_guard<StructureLock> guard(bank_.structure_lock());
     if (k < kEchoUnits) bank_.current().echolevel[k] = static_cast<uint32_t>(value < 0 ? 0 : value);
 }
 

@@ -1,4 +1,5 @@
 #pragma once
+#include <array>
 #include <string>
 #include <utility>
 #include <vector>
@@ -46,6 +47,7 @@ public:
 
 private:
     int echo_clones() const;
+    std::array<uint16_t, kTracks> routing();
     void route(int track, int slot);
 
     SongBank& bank_;

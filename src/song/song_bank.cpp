@@ -102,6 +102,7 @@ void SongBank::Gofree(int pattern) {
 }
 
 void SongBank::Raz_data(int sample) {
+    std::lock_guard<StructureLock> guard(*lock_);
     if (p_s* s = this->sample(sample)) ondrel::Raz_data(*s);
 }
 
@@ -124,6 +125,7 @@ void SongBank::updatenbvoice(short tracks) {
 
 void SongBank::select(int song) {
     if (song < 0 || song >= nbimod) return;
+    std::lock_guard<StructureLock> guard(*lock_);
     noimod = static_cast<int16_t>(song);
     nbvoie = current().nbtrack;
 }

@@ -36,7 +36,7 @@ public:
     uint8_t fmulload = 0;
     std::vector<PatternRef> p_pat;   // nbimod x 128
     std::vector<SampleRef> t_sound;  // nbimod x 128
-    int16_t nbvoie = 0;
+    std::atomic<int16_t> nbvoie{0};  // read by the sequencer on the audio thread
     // Set while a whole song is swapped in; the render callback then renders silence.
     std::atomic<uint8_t> loadin{0};
     // The sample being replaced (local number), 65535 for none; voices on it are skipped.
@@ -67,6 +67,7 @@ public:
     void killmusic();
     // Makes song current.
     void select(int song);
+    // Resets the header of a sample that exists, with the render callback kept off it.
 
     // Replaces song's record, patterns and samples with data (whose base indices are
     // rewritten for the slot), under the structure lock; the old ones are freed after.

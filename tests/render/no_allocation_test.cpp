@@ -48,13 +48,15 @@ namespace {
 using NoAllocation = test::MixerFixture;
 
 TEST_F(NoAllocation, BufferProcAllocatesNothingWhilePlaying) {
-    // A song that uses every path: several tracks, a loop, sends, envelopes, commands.
+    // A song that uses every path: a track through each effect unit, loops, stereo and
+    // 16-bit data, envelopes, interpolation, commands and auto pan.
+    constexpr int kUnits[] = {1, 2, 3, 5, 9, 10, 11, 12, 16, 17};
+    constexpr int kTracksUsed = 12;
     TMOD& m = song();
-    m.nbtrack = 4;
-    engine.bank.nbvoie = 4;
-    engine.slots.reserve_send_buffers(3);
-    m.tracke[1] = 11;
-    m.tracke[2] = 16;
+    m.nbtrack = kTracksUsed;
+    engine.bank.updatenbvoice(kTracksUsed);
+    engine.slots.reserve_send_buffers(kEffectSlots);
+    for (int t = 0; t < 10; ++t) m.tracke[t] = static_cast<uint16_t>(kUnits[t]);
     m.efxflag[11] = 1;
     p_s& a = sample8(1, std::vector<int8_t>(5000, 40));
     a.loopon = 1;
@@ -63,13 +65,13 @@ TEST_F(NoAllocation, BufferProcAllocatesNothingWhilePlaying) {
     a.flagword = 31;
     a.flag2 = 1;
     sample16(2, std::vector<int16_t>(3000, 1000), true);
+    sample16(3, std::vector<int16_t>(3000, -700));
     Pattern* p = engine.bank.song_pattern(0);
-    for (int r = 0; r < 64; r += 2) {
-        p->col[0][r] = {48, 0, 0, 1, 4, 0x44};
-        p->col[1][r] = {60, 64, 0, 1, 33, 11};
-        p->col[2][r] = {55, 0, 0, 2, 0, 0x37};
-        p->col[3][r + 1] = {0x80, 0, 0, 0, 10, 0x02};
-    }
+    for (int r = 0; r < 64; r += 2)
+        for (int t = 0; t < kTracksUsed; ++t)
+            p->col[t][r] = {static_cast<uint8_t>(40 + t), 0, 0, static_cast<uint8_t>(1 + t % 3),
+                            static_cast<uint8_t>(t == 11 ? 33 : (t % 2 ? 4 : 10)), static_cast<uint8_t>(t == 11 ? 12 : 0x21)};
+    p->col[11][1] = {0x80, 0, 0, 0, 10, 0x02};
     player.start(false);
     std::vector<float> out(2 * 1024);
     mixer.BufferProc(nullptr, out.data(), out.size() * 4, AudioFormat{});  // warm up
@@ -79,6 +81,7 @@ TEST_F(NoAllocation, BufferProcAllocatesNothingWhilePlaying) {
     EXPECT_EQ(allocations.load(), 0);
     EXPECT_GT(mixer.nbpass.load(), 300u);
     EXPECT_GT(mixer.lmax.load(), 0.0f);  // it did play
+    EXPECT_GT(mixer.pass.load(), 300u);  // and ran the effect stage
 }
 
 }  // namespace
