@@ -185,7 +185,10 @@ std::string song_text(const SongBank& bank, int song, const EffectSlots& slots) 
         for (int t = 0; t < kTracks; ++t) {
             const int n = used_cells(p->column(t), rows);
             cells += n;
-            if (n) used += " " + std::to_string(t + 1);
+            if (n) {
+                used += ' ';
+                used += std::to_string(t + 1);
+            }
         }
         std::snprintf(line, sizeof line, "  %3d  %4d rows  %2d tracks  %5d cells  used tracks:%s\n", i, rows,
                       p->allocated_tracks(), cells, used.empty() ? " none" : used.c_str());

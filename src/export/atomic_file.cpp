@@ -14,7 +14,10 @@ bool ReplacingFile::open(const std::string& path, std::string& why) {
     namespace fs = std::filesystem;
     const fs::path target(path);
     const fs::path dir = target.has_parent_path() ? target.parent_path() : fs::path(".");
-    std::string temp = (dir / ("." + target.filename().string() + ".XXXXXX")).string();
+    std::string leaf = ".";
+    leaf += target.filename().string();
+    leaf += ".XXXXXX";
+    std::string temp = (dir / leaf).string();
     const int fd = mkstemp(temp.data());
     if (fd < 0) {
         why = "cannot write in " + dir.string() + ": " + std::strerror(errno);

@@ -43,7 +43,7 @@ void le32(std::vector<uint8_t>& b, uint32_t v) {
     le16(b, v >> 16);
 }
 void tag(std::vector<uint8_t>& b, const char* t) {
-    b.insert(b.end(), t, t + 4);
+    for (int i = 0; i < 4; ++i) b.push_back(static_cast<uint8_t>(t[i]));
 }
 }  // namespace
 

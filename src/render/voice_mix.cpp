@@ -39,47 +39,56 @@ double mix_mono(const void* data, int64_t pos, double f, double step, int count,
     return f + count * step;
 }
 
-// Four frames at a time: the four read offsets in one vector, both neighbours of each
-// fetched by one gather (a 32-bit read holds sample i and sample i + 1).
+// Eight frames at a time: the read offsets in two vectors of four doubles, both neighbours
+// of each frame fetched by one gather (a 32-bit read holds sample i and sample i + 1).
 template <typename S, bool Interpolate, SendMode Send>
 __attribute__((target("avx2,fma"))) double mix_mono_avx2(const void* data, int64_t pos, double f, double step,
                                                          int count, float* out, float* send, const MixGains& g) {
     const S* d = static_cast<const S*>(data) + pos;
     const int* words = reinterpret_cast<const int*>(d);
-    const __m256d lanes = _mm256_setr_pd(0, 1, 2, 3);
+    const __m256d lanes_lo = _mm256_setr_pd(0, 1, 2, 3);
+    const __m256d lanes_hi = _mm256_setr_pd(4, 5, 6, 7);
     const __m256d vstep = _mm256_set1_pd(step);
     const __m256d vf = _mm256_set1_pd(f);
     const __m256 gains = _mm256_setr_ps(g.left, g.right, g.left, g.right, g.left, g.right, g.left, g.right);
-    const __m128 gsend = _mm_set1_ps(g.send);
+    const __m256 gsend = _mm256_set1_ps(g.send);
     int i = 0;
-    for (; i + 4 <= count; i += 4) {
-        const __m256d k = _mm256_add_pd(_mm256_set1_pd(static_cast<double>(i)), lanes);
-        const __m256d x = _mm256_add_pd(vf, _mm256_mul_pd(k, vstep));
-        const __m128i whole = _mm256_cvttpd_epi32(x);
-        __m128i pair;
-        __m128i a, b;
+    for (; i + 8 <= count; i += 8) {
+        const __m256d base = _mm256_set1_pd(static_cast<double>(i));
+        const __m256d x_lo = _mm256_add_pd(vf, _mm256_mul_pd(_mm256_add_pd(base, lanes_lo), vstep));
+        const __m256d x_hi = _mm256_add_pd(vf, _mm256_mul_pd(_mm256_add_pd(base, lanes_hi), vstep));
+        const __m128i whole_lo = _mm256_cvttpd_epi32(x_lo);
+        const __m128i whole_hi = _mm256_cvttpd_epi32(x_hi);
+        const __m256i whole = _mm256_set_m128i(whole_hi, whole_lo);
+        __m256i a, b;
         if constexpr (sizeof(S) == 1) {
-            pair = _mm_i32gather_epi32(words, whole, 1);
-            a = _mm_srai_epi32(_mm_slli_epi32(pair, 24), 24);
-            b = _mm_srai_epi32(_mm_slli_epi32(pair, 16), 24);
+            const __m256i pair = _mm256_i32gather_epi32(words, whole, 1);
+            a = _mm256_srai_epi32(_mm256_slli_epi32(pair, 24), 24);
+            b = _mm256_srai_epi32(_mm256_slli_epi32(pair, 16), 24);
         } else {
-            pair = _mm_i32gather_epi32(words, whole, 2);
-            a = _mm_srai_epi32(_mm_slli_epi32(pair, 16), 16);
-            b = _mm_srai_epi32(pair, 16);
+            const __m256i pair = _mm256_i32gather_epi32(words, whole, 2);
+            a = _mm256_srai_epi32(_mm256_slli_epi32(pair, 16), 16);
+            b = _mm256_srai_epi32(pair, 16);
         }
-        __m128 s = _mm_cvtepi32_ps(a);
+        __m256 s = _mm256_cvtepi32_ps(a);
         if constexpr (Interpolate) {
-            const __m128 frac = _mm256_cvtpd_ps(_mm256_sub_pd(x, _mm256_cvtepi32_pd(whole)));
-            s = _mm_add_ps(s, _mm_mul_ps(_mm_sub_ps(_mm_cvtepi32_ps(b), s), frac));
+            const __m128 frac_lo = _mm256_cvtpd_ps(_mm256_sub_pd(x_lo, _mm256_cvtepi32_pd(whole_lo)));
+            const __m128 frac_hi = _mm256_cvtpd_ps(_mm256_sub_pd(x_hi, _mm256_cvtepi32_pd(whole_hi)));
+            const __m256 frac = _mm256_set_m128(frac_hi, frac_lo);
+            s = _mm256_add_ps(s, _mm256_mul_ps(_mm256_sub_ps(_mm256_cvtepi32_ps(b), s), frac));
         } else {
             (void)b;
         }
-        const __m256 twice = _mm256_set_m128(_mm_unpackhi_ps(s, s), _mm_unpacklo_ps(s, s));
+        // [s0 s0 s1 s1 | s4 s4 s5 s5] and [s2 s2 s3 s3 | s6 s6 s7 s7] into frame order.
+        const __m256 lo = _mm256_unpacklo_ps(s, s);
+        const __m256 hi = _mm256_unpackhi_ps(s, s);
         float* o = out + 2 * i;
-        _mm256_storeu_ps(o, _mm256_add_ps(_mm256_loadu_ps(o), _mm256_mul_ps(twice, gains)));
-        if constexpr (Send == SendMode::First) _mm_storeu_ps(send + i, _mm_mul_ps(s, gsend));
+        _mm256_storeu_ps(o, _mm256_add_ps(_mm256_loadu_ps(o), _mm256_mul_ps(_mm256_permute2f128_ps(lo, hi, 0x20), gains)));
+        _mm256_storeu_ps(o + 8,
+                         _mm256_add_ps(_mm256_loadu_ps(o + 8), _mm256_mul_ps(_mm256_permute2f128_ps(lo, hi, 0x31), gains)));
+        if constexpr (Send == SendMode::First) _mm256_storeu_ps(send + i, _mm256_mul_ps(s, gsend));
         if constexpr (Send == SendMode::Add)
-            _mm_storeu_ps(send + i, _mm_add_ps(_mm_loadu_ps(send + i), _mm_mul_ps(s, gsend)));
+            _mm256_storeu_ps(send + i, _mm256_add_ps(_mm256_loadu_ps(send + i), _mm256_mul_ps(s, gsend)));
     }
     mix_mono_frames<S, Interpolate, Send>(d, f, step, i, count, out, send, g);
     return f + count * step;

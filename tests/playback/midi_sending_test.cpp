@@ -1,3 +1,4 @@
+#include <cstdio>
 #include <string>
 
 #include "song_fixture.h"
@@ -15,8 +16,12 @@ public:
 
 private:
     void add(const char* what, int c, int a, int b) {
-        sent.push_back(std::string(what) + " " + std::to_string(c) + " " + std::to_string(a) +
-                       (b >= 0 ? " " + std::to_string(b) : ""));
+        char line[64];
+        if (b >= 0)
+            std::snprintf(line, sizeof line, "%s %d %d %d", what, c, a, b);
+        else
+            std::snprintf(line, sizeof line, "%s %d %d", what, c, a);
+        sent.push_back(line);
     }
 };
 
