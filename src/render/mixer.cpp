@@ -5,8 +5,8 @@
 #include <cstring>
 
 #include "playback/tables.h"
-#include "render/pan_table.h"
 #include "render/output_clip.h"
+#include "render/pan_table.h"
 #include "render/voice_mix.h"
 
 namespace ondrel {

@@ -36,7 +36,8 @@ __attribute__((target("avx2"))) Peaks clip_avx2(float* out, int frames) {
     }
     alignas(32) float lanes[8];
     _mm256_store_ps(lanes, peak);
-    Peaks p{std::max({lanes[0], lanes[2], lanes[4], lanes[6]}), std::max({lanes[1], lanes[3], lanes[5], lanes[7]})};
+    Peaks p{std::max({lanes[0], lanes[2], lanes[4], lanes[6]}),
+            std::max({lanes[1], lanes[3], lanes[5], lanes[7]})};
     return clip_frames(out, i, frames, p);
 }
 

@@ -43,7 +43,8 @@ double mix_mono(const void* data, int64_t pos, double f, double step, int count,
 // of each frame fetched by one gather (a 32-bit read holds sample i and sample i + 1).
 template <typename S, bool Interpolate, SendMode Send>
 __attribute__((target("avx2,fma"))) double mix_mono_avx2(const void* data, int64_t pos, double f, double step,
-                                                         int count, float* out, float* send, const MixGains& g) {
+                                                         int count, float* out, float* send,
+                                                         const MixGains& g) {
     const S* d = static_cast<const S*>(data) + pos;
     const int* words = reinterpret_cast<const int*>(d);
     const __m256d lanes_lo = _mm256_setr_pd(0, 1, 2, 3);
@@ -83,9 +84,10 @@ __attribute__((target("avx2,fma"))) double mix_mono_avx2(const void* data, int64
         const __m256 lo = _mm256_unpacklo_ps(s, s);
         const __m256 hi = _mm256_unpackhi_ps(s, s);
         float* o = out + 2 * i;
-        _mm256_storeu_ps(o, _mm256_add_ps(_mm256_loadu_ps(o), _mm256_mul_ps(_mm256_permute2f128_ps(lo, hi, 0x20), gains)));
-        _mm256_storeu_ps(o + 8,
-                         _mm256_add_ps(_mm256_loadu_ps(o + 8), _mm256_mul_ps(_mm256_permute2f128_ps(lo, hi, 0x31), gains)));
+        _mm256_storeu_ps(
+            o, _mm256_add_ps(_mm256_loadu_ps(o), _mm256_mul_ps(_mm256_permute2f128_ps(lo, hi, 0x20), gains)));
+        _mm256_storeu_ps(o + 8, _mm256_add_ps(_mm256_loadu_ps(o + 8),
+                                              _mm256_mul_ps(_mm256_permute2f128_ps(lo, hi, 0x31), gains)));
         if constexpr (Send == SendMode::First) _mm256_storeu_ps(send + i, _mm256_mul_ps(s, gsend));
         if constexpr (Send == SendMode::Add)
             _mm256_storeu_ps(send + i, _mm256_add_ps(_mm256_loadu_ps(send + i), _mm256_mul_ps(s, gsend)));
@@ -95,7 +97,8 @@ __attribute__((target("avx2,fma"))) double mix_mono_avx2(const void* data, int64
 }
 
 template <typename S>
-inline void mix_stereo_frames(const S* d, double f, double step, int from, int count, float* out, const MixGains& g) {
+inline void mix_stereo_frames(const S* d, double f, double step, int from, int count, float* out,
+                              const MixGains& g) {
     for (int i = from; i < count; ++i) {
         const int64_t whole = static_cast<int64_t>(f + i * step);
         out[2 * i] += g.left * sample_at(d, 2 * whole);
@@ -104,15 +107,17 @@ inline void mix_stereo_frames(const S* d, double f, double step, int from, int c
 }
 
 template <typename S>
-double mix_stereo(const void* data, int64_t pos, double f, double step, int count, float* out, const MixGains& g) {
+double mix_stereo(const void* data, int64_t pos, double f, double step, int count, float* out,
+                  const MixGains& g) {
     mix_stereo_frames(static_cast<const S*>(data) + 2 * pos, f, step, 0, count, out, g);
     return f + count * step;
 }
 
 // Four stereo frames at a time; one gather fetches a frame's two channels.
 template <typename S>
-__attribute__((target("avx2,fma"))) double mix_stereo_avx2(const void* data, int64_t pos, double f, double step,
-                                                           int count, float* out, const MixGains& g) {
+__attribute__((target("avx2,fma"))) double mix_stereo_avx2(const void* data, int64_t pos, double f,
+                                                           double step, int count, float* out,
+                                                           const MixGains& g) {
     const S* d = static_cast<const S*>(data) + 2 * pos;
     const int* words = reinterpret_cast<const int*>(d);
     const __m256d lanes = _mm256_setr_pd(0, 1, 2, 3);
@@ -156,10 +161,12 @@ MonoMixFn pick() {
 template <typename S>
 MonoMixFn pick_mono(bool interpolate, SendMode send) {
     switch (send) {
-        case SendMode::None: return interpolate ? pick<S, true, SendMode::None>() : pick<S, false, SendMode::None>();
+        case SendMode::None:
+            return interpolate ? pick<S, true, SendMode::None>() : pick<S, false, SendMode::None>();
         case SendMode::First:
             return interpolate ? pick<S, true, SendMode::First>() : pick<S, false, SendMode::First>();
-        case SendMode::Add: return interpolate ? pick<S, true, SendMode::Add>() : pick<S, false, SendMode::Add>();
+        case SendMode::Add:
+            return interpolate ? pick<S, true, SendMode::Add>() : pick<S, false, SendMode::Add>();
     }
     return nullptr;
 }

@@ -128,3 +128,27 @@ TEST(MtmReader, OtherFilesAreRefusedAndShortOnesKeptInBounds) {
 
 }  // namespace
 }  // namespace ondrel
+
+namespace ondrel {
+namespace {
+
+// Found by fuzzing: headers claiming far more than the file holds made the reader zero
+// megabytes per file. What is allocated follows the file, not the claim.
+TEST(MtmReader, ClaimedSizesAreBoundedByTheFile) {
+    Bytes b;
+    b.text("MTM", 3).u8(0x10).text("liar", 20).le16(65535).u8(0).u8(0).le16(0).u8(1).u8(0).u8(64).u8(4);
+    b.zeros(32);
+    b.text("big", 22).le32(0xFFFFFFF0u).le32(0).le32(0).u8(0).u8(64).u8(0);
+    b.zeros(128 + 10);
+    ModuleRead out;
+    ByteReader r(b.v);
+    ASSERT_TRUE(read_mtm(r, out));
+    EXPECT_TRUE(out.truncated);
+    ASSERT_NE(out.song.samples[0], nullptr);
+    EXPECT_EQ(out.song.samples[0]->length, 0u);
+    ASSERT_NE(out.song.patterns[0], nullptr);
+    EXPECT_TRUE(out.song.patterns[0]->col[0][0].empty());
+}
+
+}  // namespace
+}  // namespace ondrel

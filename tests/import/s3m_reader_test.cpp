@@ -250,6 +250,20 @@ TEST(S3mReader, SamplesAreMadeSignedInterleavedAndMeasuredInBytes) {
     EXPECT_EQ(r.song.samples[3]->length, 0u);
 }
 
+// Found by fuzzing: a sample header claiming gigabytes made the reader zero them first.
+TEST(S3mReader, ClaimedSampleSizesAreBoundedByTheFile) {
+    S3mFile f;
+    f.patterns = {row0({})};
+    S3mInstrument s;
+    s.data = {1, 2, 3, 4, 5, 6};
+    s.frames = 0x7FFFFFFF;
+    s.flags = 4;  // 16-bit: twice the bytes claimed
+    f.instruments = {s};
+    const ModuleRead r = read(f.bytes());
+    EXPECT_TRUE(r.truncated);
+    EXPECT_EQ(r.song.samples[0]->length, 6u);
+}
+
 TEST(S3mReader, FilesWithoutTheMarkAreRefused) {
     auto bytes = S3mFile{}.bytes();
     bytes[44] = 'X';
