@@ -103,18 +103,6 @@ bool WavWriter::write(const float* samples, size_t frames) {
     return true;
 }
 
-bool WavWriter::write_pcm16(const int16_t* samples, size_t frames) {
-    const size_t n = frames * static_cast<size_t>(channels_);
-    std::vector<uint8_t> bytes(2 * n);
-    for (size_t i = 0; i < n; ++i) {
-        bytes[2 * i] = static_cast<uint8_t>(samples[i] & 0xff);
-        bytes[2 * i + 1] = static_cast<uint8_t>((samples[i] >> 8) & 0xff);
-    }
-    if (!put(bytes.data(), bytes.size())) return false;
-    frames_ += frames;
-    return true;
-}
-
 bool WavWriter::finish(std::string& why) {
     if (!file_.stream()) {
         why = "nothing to finish";

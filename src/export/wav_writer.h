@@ -21,8 +21,6 @@ public:
     bool open(const std::string& path, int channels, int rate, WavSampleFormat format, std::string& why);
     // Interleaved float frames in [-1, 1]; converted to the file's format.
     bool write(const float* samples, size_t frames);
-    // Interleaved 16-bit frames, for files of 16-bit format.
-    bool write_pcm16(const int16_t* samples, size_t frames);
     // Patches the header and renames the file into place.
     bool finish(std::string& why);
     // Drops the temporary file; the target is left as it was.

@@ -1,4 +1,6 @@
 #pragma once
+#include <bit>
+#include <cstdint>
 
 namespace ondrel {
 
