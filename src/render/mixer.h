@@ -69,7 +69,9 @@ private:
     // has written its send buffer yet.
     std::array<int16_t, kEffectSlots> control_{};
     std::array<int16_t, kEffectSlots> compact_{};
-    std::array<uint8_t, kEffectSlots> written_{};
+    std::array<uint8_t, kEffectSlots + 1> written_{};  // by compact number
+    std::array<int16_t, kEffectSlots> routed_{};        // slots numbered, in order
+    int routed_count_ = 0;
     std::array<int16_t, 8192> bufferrecmusic_{};
 };
 
