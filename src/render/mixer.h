@@ -70,7 +70,7 @@ private:
     std::array<int16_t, kEffectSlots> control_{};
     std::array<int16_t, kEffectSlots> compact_{};
     std::array<uint8_t, kEffectSlots + 1> written_{};  // by compact number
-    std::array<int16_t, kEffectSlots> routed_{};        // slots numbered, in order
+    std::array<int16_t, kEffectSlots> routed_{};       // slots numbered, in order
     int routed_count_ = 0;
     std::array<int16_t, 8192> bufferrecmusic_{};
 };
