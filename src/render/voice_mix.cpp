@@ -14,16 +14,18 @@ inline float sample_at(const S* d, int64_t i) {
     return static_cast<float>(d[i]);
 }
 
-template <typename S, bool Interpolate, SendMode Send>
-inline void mix_mono_frames(const S* d, double f, double step, int from, int count, float* out, float* send,
+// Real is the precision of the read offsets: double for the scalar loop, float for the
+// tail of the vector loop, which reads its offsets in single precision.
+template <typename Real, typename S, bool Interpolate, SendMode Send>
+inline void mix_mono_frames(const S* d, Real f, Real step, int from, int count, float* out, float* send,
                             const MixGains& g) {
     for (int i = from; i < count; ++i) {
-        const double x = f + i * step;
+        const Real x = f + static_cast<Real>(i) * step;
         const int64_t whole = static_cast<int64_t>(x);
         float s = sample_at(d, whole);
         if constexpr (Interpolate) {
             const float b = sample_at(d, whole + 1);  // the slack after the data covers the end
-            s = s + (b - s) * static_cast<float>(x - static_cast<double>(whole));
+            s = s + (b - s) * static_cast<float>(x - static_cast<Real>(whole));
         }
         out[2 * i] += s * g.left;
         out[2 * i + 1] += s * g.right;
@@ -35,28 +37,12 @@ inline void mix_mono_frames(const S* d, double f, double step, int from, int cou
 template <typename S, bool Interpolate, SendMode Send>
 double mix_mono(const void* data, int64_t pos, double f, double step, int count, float* out, float* send,
                 const MixGains& g) {
-    mix_mono_frames<S, Interpolate, Send>(static_cast<const S*>(data) + pos, f, step, 0, count, out, send, g);
+    mix_mono_frames<double, S, Interpolate, Send>(static_cast<const S*>(data) + pos, f, step, 0, count, out, send, g);
     return f + count * step;
 }
 
-// The vector path reads frame i at offset f + i x step computed in single precision:
-// eight lanes a step, and within a piece (at most 4096 frames) the error stays far below
-// a frame. Its scalar tail uses the same formula.
-template <typename S, bool Interpolate, SendMode Send>
-inline void mix_mono_frames_f(const S* d, float f, float step, int from, int count, float* out, float* send,
-                              const MixGains& g) {
-    for (int i = from; i < count; ++i) {
-        const float x = f + static_cast<float>(i) * step;
-        const int whole = static_cast<int>(x);
-        float s = sample_at(d, whole);
-        if constexpr (Interpolate) s = s + (sample_at(d, whole + 1) - s) * (x - static_cast<float>(whole));
-        out[2 * i] += s * g.left;
-        out[2 * i + 1] += s * g.right;
-        if constexpr (Send == SendMode::First) send[i] = s * g.send;
-        if constexpr (Send == SendMode::Add) send[i] += s * g.send;
-    }
-}
-
+// The vector path reads frame i at offset f + i x step in single precision: eight lanes a
+// step, and within a piece (at most 4096 frames) the error stays far below a frame.
 // Eight frames a step; one gather fetches both interpolation neighbours of each frame (a
 // 32-bit read holds sample i and sample i + 1).
 template <typename S, bool Interpolate, SendMode Send>
@@ -106,7 +92,7 @@ __attribute__((target("avx2,fma"))) double mix_mono_avx2(const void* data, int64
         if constexpr (Send == SendMode::Add)
             _mm256_storeu_ps(send + i, _mm256_add_ps(_mm256_loadu_ps(send + i), _mm256_mul_ps(s, gsend)));
     }
-    mix_mono_frames_f<S, Interpolate, Send>(d, ff, fstep, i, count, out, send, g);
+    mix_mono_frames<float, S, Interpolate, Send>(d, ff, fstep, i, count, out, send, g);
     return f + count * step;
 }
 
