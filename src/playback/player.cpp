@@ -38,9 +38,13 @@ int Player::dopatend() {
 
 void Player::gere_play() {
     if (tr.fvuvu.load(std::memory_order_relaxed)) {
-        for (auto& meter : tr.valvu) {
-            const float v = meter.load(std::memory_order_relaxed);
-            if (v != 0.0f) meter.store(v - 1.0f, std::memory_order_relaxed);
+        // Only meters a note lit still fall; the rest stay at zero.
+        static_assert(kTracks <= 64, "a bit per track");
+        for (uint64_t bits = falling_meters_; bits; bits &= bits - 1) {
+            const int t = __builtin_ctzll(bits);
+            const float v = tr.valvu[t].load(std::memory_order_relaxed) - 1.0f;
+            tr.valvu[t].store(std::max(v, 0.0f), std::memory_order_relaxed);
+            if (v <= 0.0f) falling_meters_ &= ~(uint64_t{1} << t);
         }
     }
     const uint8_t playing = tr.playing;
@@ -161,6 +165,7 @@ void Player::read_track(int t, int position, const Pattern* pattern, bool auditi
         if (has_note) {
             v.noteperiod = floatnote()[cell.note];
             tr.valvu[t].store(128.0f, std::memory_order_relaxed);
+            falling_meters_ |= uint64_t{1} << t;
             if (cell.command == 3 || cell.command == 5) {
                 v.portatarget = finetune_factor(v.finetune) * v.noteperiod;
                 v.portaflag = 1;

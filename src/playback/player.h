@@ -101,6 +101,7 @@ private:
     EffectSlots& slots_;
     std::array<int16_t, kTracks> curvoice_{};  // voice each track's commands act on
     int local_pos_ = 0;                        // the position while a call works on it
+    uint64_t falling_meters_ = 0;              // a bit per track whose meter is above zero
     std::vector<uint64_t> visited_;            // a bit per position and row when watched
     void mark_visited();
     std::atomic<uint32_t> stop_request_{0};

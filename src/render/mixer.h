@@ -72,6 +72,8 @@ private:
     std::array<uint8_t, kEffectSlots + 1> written_{};  // by compact number
     std::array<int16_t, kEffectSlots> routed_{};       // slots numbered, in order
     int routed_count_ = 0;
+    std::array<int16_t, kEffectSlots> routed_by_slot_{};  // the same, by slot number
+    int routed_by_slot_count_ = 0;
     std::array<int16_t, 8192> bufferrecmusic_{};
 };
 

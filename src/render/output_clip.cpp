@@ -21,21 +21,27 @@ Peaks clip_frames(float* out, int from, int frames, Peaks p) {
     return p;
 }
 
+// Clips eight values in place; returns their magnitudes.
+__attribute__((target("avx2"))) inline __m256 clip8(float* o) {
+    const __m256 v = _mm256_min_ps(
+        _mm256_max_ps(_mm256_mul_ps(_mm256_loadu_ps(o), _mm256_set1_ps(0.25f)), _mm256_set1_ps(-1.0f)),
+        _mm256_set1_ps(1.0f));
+    _mm256_storeu_ps(o, v);
+    return _mm256_and_ps(v, _mm256_castsi256_ps(_mm256_set1_epi32(0x7fffffff)));
+}
+
 __attribute__((target("avx2"))) Peaks clip_avx2(float* out, int frames) {
-    const __m256 quarter = _mm256_set1_ps(0.25f);
-    const __m256 one = _mm256_set1_ps(1.0f);
-    const __m256 minus_one = _mm256_set1_ps(-1.0f);
-    const __m256 magnitude = _mm256_castsi256_ps(_mm256_set1_epi32(0x7fffffff));
+    // Two peak registers, so the maxima do not wait on each other.
     __m256 peak = _mm256_setzero_ps();
+    __m256 peak2 = _mm256_setzero_ps();
     int i = 0;
-    for (; i + 4 <= frames; i += 4) {  // four stereo frames a vector: L R L R L R L R
-        __m256 v = _mm256_mul_ps(_mm256_loadu_ps(out + 2 * i), quarter);
-        v = _mm256_min_ps(_mm256_max_ps(v, minus_one), one);
-        _mm256_storeu_ps(out + 2 * i, v);
-        peak = _mm256_max_ps(peak, _mm256_and_ps(v, magnitude));
+    for (; i + 8 <= frames; i += 8) {  // four stereo frames a vector: L R L R L R L R
+        peak = _mm256_max_ps(peak, clip8(out + 2 * i));
+        peak2 = _mm256_max_ps(peak2, clip8(out + 2 * i + 8));
     }
+    for (; i + 4 <= frames; i += 4) peak = _mm256_max_ps(peak, clip8(out + 2 * i));
     alignas(32) float lanes[8];
-    _mm256_store_ps(lanes, peak);
+    _mm256_store_ps(lanes, _mm256_max_ps(peak, peak2));
     Peaks p{std::max({lanes[0], lanes[2], lanes[4], lanes[6]}),
             std::max({lanes[1], lanes[3], lanes[5], lanes[7]})};
     return clip_frames(out, i, frames, p);

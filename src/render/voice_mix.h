@@ -23,8 +23,9 @@ using MonoMixFn = double (*)(const void* data, int64_t pos, double x, double ste
 using StereoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count, float* out,
                                const MixGains& g);
 
-// The loop for a case; bits16 selects 16-bit data.
-MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send);
-StereoMixFn stereo_mixer(bool bits16);
+// The loop for a case; bits16 selects 16-bit data. The vector loops are used where the CPU
+// has them unless vector is false.
+MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, bool vector = true);
+StereoMixFn stereo_mixer(bool bits16, bool vector = true);
 
 }  // namespace ondrel
