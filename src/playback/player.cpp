@@ -118,11 +118,16 @@ void Player::gere_play() {
         to_window.push({kMsgStop});
     }
     if (!track_mode) tr.nopat = static_cast<int16_t>(std::clamp(pos, 0, kPositions - 1));
-    if (!visited_.empty() && tr.playing) mark_visited();
+    if (watching_ && tr.playing) mark_visited();
 }
 
 void Player::watch_for_repeats(bool on) {
-    visited_.assign(on ? static_cast<size_t>(kPositions) * kMaxRows / 64 : 0, 0);
+    // Only the rows of positions marked last time need clearing.
+    for (int p = 0; p < kPositions; ++p)
+        if (visited_positions_[p / 64] & (uint64_t{1} << (p % 64)))
+            std::fill_n(visited_.begin() + p * kWordsPerPosition, kWordsPerPosition, 0);
+    visited_positions_ = {};
+    watching_ = on;
     repeated = false;
     if (on) mark_visited();
 }
@@ -130,6 +135,7 @@ void Player::watch_for_repeats(bool on) {
 void Player::mark_visited() {
     const size_t bit = static_cast<size_t>(std::clamp<int>(tr.nopat, 0, kPositions - 1)) * kMaxRows +
                        static_cast<size_t>(std::clamp<int>(tr.nopos, 0, kMaxRows - 1));
+    visited_positions_[bit / kMaxRows / 64] |= uint64_t{1} << (bit / kMaxRows % 64);
     uint64_t& word = visited_[bit / 64];
     const uint64_t mask = uint64_t{1} << (bit % 64);
     if (word & mask) repeated.store(true, std::memory_order_relaxed);

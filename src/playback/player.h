@@ -102,7 +102,12 @@ private:
     std::array<int16_t, kTracks> curvoice_{};  // voice each track's commands act on
     int local_pos_ = 0;                        // the position while a call works on it
     uint64_t falling_meters_ = 0;              // a bit per track whose meter is above zero
-    std::vector<uint64_t> visited_;            // a bit per position and row when watched
+    // A bit per position and row while watched; kept in the player so that starting a
+    // render neither allocates nor clears more than the last one marked.
+    static constexpr int kWordsPerPosition = kMaxRows / 64;
+    std::array<uint64_t, kPositions * kWordsPerPosition> visited_{};
+    std::array<uint64_t, kPositions / 64> visited_positions_{};
+    bool watching_ = false;
     void mark_visited();
     std::atomic<uint32_t> stop_request_{0};
     std::atomic<bool> stop_silences_{false};

@@ -44,7 +44,8 @@ void Mixer::BufferProc(void*, void* buffer, unsigned long size, const AudioForma
 }
 
 void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
-    const uint64_t entry = system_time_us();
+    const bool measure = measure_load.load(std::memory_order_relaxed);
+    const uint64_t entry = measure ? system_time_us() : 0;
     std::fill(out, out + 2 * frames, 0.0f);
     nbpass.fetch_add(1, std::memory_order_relaxed);
     player_.service_audio_requests();
@@ -80,6 +81,7 @@ void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
     effect_stage(out, frames, m);
     output_stage(out, frames, format);
 
+    if (!measure) return;
     const double budget = std::trunc((frames * 8 * 0.125 / frame_rate) * 1000000.0);
     if (budget > 0)
         powermusic.store(static_cast<float>((system_time_us() - entry) / budget), std::memory_order_relaxed);
@@ -235,6 +237,10 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     const bool stereo = s->stereo != 0;
     const bool bits16 = s->bits == 16;
 
+    const StereoMixFn mix_stereo = stereo ? stereo_mixer(bits16) : nullptr;
+    const MonoMixFn mix_alone = stereo ? nullptr : mono_mixer(bits16, interpolate, send ? SendMode::First : SendMode::None);
+    const MonoMixFn mix_adding = send && !stereo ? mono_mixer(bits16, interpolate, SendMode::Add) : nullptr;
+
     int64_t pos = v.position;
     double f = v.fraction;
     int m_left = n;
@@ -268,10 +274,10 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
         if (muted) {
             x = f + cnt * step;
         } else if (stereo) {
-            x = stereo_mixer(bits16)(s->data, pos, x, step, cnt, o, gains);
+            x = mix_stereo(s->data, pos, x, step, cnt, o, gains);
         } else {
-            const SendMode mode = !send ? SendMode::None : written_[k] ? SendMode::Add : SendMode::First;
-            x = mono_mixer(bits16, interpolate, mode)(s->data, pos, x, step, cnt, o, send, gains);
+            // The first voice into a slot's send buffer sets it, the others add to it.
+            x = (send && written_[k] ? mix_adding : mix_alone)(s->data, pos, x, step, cnt, o, send, gains);
             if (send) written_[k] = 1;
         }
         pos += static_cast<int64_t>(x);

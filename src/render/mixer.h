@@ -29,6 +29,7 @@ public:
     std::atomic<uint8_t> frecmusic{0};
     std::atomic<uint8_t> record_to_file{0};
     std::atomic<uint8_t> monitor{0};
+    std::atomic<bool> measure_load{true};  // powermusic; offline renders have no deadline to meet
 
     // Meters and counters, read by the window thread.
     std::atomic<float> lmax{0};

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <span>
 #include <vector>
 
 namespace ondrel {
@@ -9,11 +10,17 @@ namespace ondrel {
 RenderEnd render_offline(Mixer& mixer, Player& player, const OfflineOptions& options,
                          const RenderSink& sink) {
     const int frames = std::clamp(options.buffer_frames, 16, kMaxFramesPerCall);
-    std::vector<float> buffer(2 * static_cast<size_t>(frames));
+    // Cache-line aligned, so the mixer's vector loads and stores never straddle two lines.
+    struct alignas(64) Frame16 {
+        float v[32];
+    };
+    std::vector<Frame16> blocks((2 * static_cast<size_t>(frames) + 31) / 32);
+    const std::span<float> buffer(blocks.front().v, 2 * static_cast<size_t>(frames));
     const AudioFormat format{static_cast<float>(kOutputRate), 2, kFormatFloat};
     const uint64_t limit = options.max_seconds > 0
                                ? static_cast<uint64_t>(std::llround(options.max_seconds * kOutputRate))
                                : UINT64_MAX;
+    const bool measured = mixer.measure_load.exchange(false);
     player.tr.floop = 0;
     player.watch_for_repeats(true);
     player.start(false);
@@ -44,6 +51,7 @@ RenderEnd render_offline(Mixer& mixer, Player& player, const OfflineOptions& opt
     }
     player.stoppi();
     player.watch_for_repeats(false);
+    mixer.measure_load = measured;
     return end;
 }
 

@@ -1,0 +1,10 @@
+#pragma once
+// The AVX2 mix loops, for CPUs that have AVX2 and FMA (the caller checks).
+#include "render/voice_mix.h"
+
+namespace ondrel {
+
+MonoMixFn mono_mixer_avx2(bool bits16, bool interpolate, SendMode send);
+StereoMixFn stereo_mixer_avx2(bool bits16);
+
+}  // namespace ondrel
