@@ -31,8 +31,7 @@ struct Run {
     double x() const { return work_seconds > 0 ? audio_seconds / work_seconds : 0; }
 };
 
-// One timed render of a song: audio seconds made and seconds spent; setting up and
-// tearing down the player are not timed.
+// One timed render of a song: audio seconds made and seconds spent.
 using RenderOnce = std::function<Run()>;
 
 // Renders again and again until enough work is timed for the clock to measure a short
@@ -57,66 +56,96 @@ Run median_of(int runs, const RenderOnce& render) {
     return all[all.size() / 2];
 }
 
-Run ours(const std::string& path) {
-    ondrel::Engine engine;
-    Run r;
-    if (!ondrel::load(path, engine.bank, engine.slots).ok) return r;
-    engine.mixer.qual = 1;
-    uint64_t frames = 0;
-    const auto start = Clock::now();
-    ondrel::render_offline(engine.mixer, engine.player, {kFrames, kMaxSeconds}, [&](const float*, int n, double) {
-        frames += static_cast<uint64_t>(n);
-        return true;
-    });
-    r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
-    r.audio_seconds = static_cast<double>(frames) / kRate;
-    return r;
-}
+// Each player loads its module once (not timed), then renders it from the start as often
+// as asked, as someone playing a song again would.
 
-Run openmpt(const std::vector<char>& data) {
-    Run r;
-    openmpt_module* mod =
-        openmpt_module_create_from_memory2(data.data(), data.size(), nullptr, nullptr, nullptr, nullptr, nullptr,
-                                           nullptr, nullptr);
-    if (!mod) return r;
-    openmpt_module_set_render_param(mod, OPENMPT_MODULE_RENDER_INTERPOLATIONFILTER_LENGTH, 2);
-    std::vector<float> buffer(2 * kFrames);
-    uint64_t frames = 0;
-    const auto start = Clock::now();
-    while (frames < kMaxSeconds * kRate) {
-        const size_t n = openmpt_module_read_interleaved_float_stereo(mod, kRate, kFrames, buffer.data());
-        if (n == 0) break;
-        frames += n;
+class Ours {
+public:
+    explicit Ours(const std::string& path) : ok_(ondrel::load(path, engine_.bank, engine_.slots).ok) {
+        engine_.mixer.qual = 1;
     }
-    r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
-    r.audio_seconds = static_cast<double>(frames) / kRate;
-    openmpt_module_destroy(mod);
-    return r;
-}
-
-Run libxmp(const std::vector<char>& data) {
-    Run r;
-    xmp_context ctx = xmp_create_context();
-    if (xmp_load_module_from_memory(ctx, data.data(), static_cast<long>(data.size())) != 0) {
-        xmp_free_context(ctx);
+    Run render() {
+        Run r;
+        if (!ok_) return r;
+        uint64_t frames = 0;
+        const auto start = Clock::now();
+        ondrel::render_offline(engine_.mixer, engine_.player, {kFrames, kMaxSeconds},
+                               [&](const float*, int n, double) {
+                                   frames += static_cast<uint64_t>(n);
+                                   return true;
+                               });
+        r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
+        r.audio_seconds = static_cast<double>(frames) / kRate;
         return r;
     }
-    xmp_start_player(ctx, kRate, 0);
-    xmp_set_player(ctx, XMP_PLAYER_INTERP, XMP_INTERP_LINEAR);
-    std::vector<int16_t> buffer(2 * kFrames);
-    uint64_t frames = 0;
-    const auto start = Clock::now();
-    while (frames < kMaxSeconds * kRate) {
-        if (xmp_play_buffer(ctx, buffer.data(), static_cast<int>(buffer.size() * 2), 1) != 0) break;
-        frames += kFrames;
+
+private:
+    ondrel::Engine engine_;
+    bool ok_;
+};
+
+class Openmpt {
+public:
+    explicit Openmpt(const std::vector<char>& data)
+        : mod_(openmpt_module_create_from_memory2(data.data(), data.size(), nullptr, nullptr, nullptr, nullptr,
+                                                  nullptr, nullptr, nullptr)) {
+        if (mod_) openmpt_module_set_render_param(mod_, OPENMPT_MODULE_RENDER_INTERPOLATIONFILTER_LENGTH, 2);
     }
-    r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
-    r.audio_seconds = static_cast<double>(frames) / kRate;
-    xmp_end_player(ctx);
-    xmp_release_module(ctx);
-    xmp_free_context(ctx);
-    return r;
-}
+    ~Openmpt() {
+        if (mod_) openmpt_module_destroy(mod_);
+    }
+    Run render() {
+        Run r;
+        if (!mod_) return r;
+        openmpt_module_set_position_seconds(mod_, 0.0);
+        uint64_t frames = 0;
+        const auto start = Clock::now();
+        while (frames < kMaxSeconds * kRate) {
+            const size_t n = openmpt_module_read_interleaved_float_stereo(mod_, kRate, kFrames, buffer_.data());
+            if (n == 0) break;
+            frames += n;
+        }
+        r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
+        r.audio_seconds = static_cast<double>(frames) / kRate;
+        return r;
+    }
+
+private:
+    openmpt_module* mod_;
+    std::vector<float> buffer_ = std::vector<float>(2 * kFrames);
+};
+
+class Xmp {
+public:
+    explicit Xmp(const std::vector<char>& data) : ctx_(xmp_create_context()) {
+        ok_ = xmp_load_module_from_memory(ctx_, data.data(), static_cast<long>(data.size())) == 0;
+    }
+    ~Xmp() {
+        if (ok_) xmp_release_module(ctx_);
+        xmp_free_context(ctx_);
+    }
+    Run render() {
+        Run r;
+        if (!ok_) return r;
+        xmp_start_player(ctx_, kRate, 0);
+        xmp_set_player(ctx_, XMP_PLAYER_INTERP, XMP_INTERP_LINEAR);
+        uint64_t frames = 0;
+        const auto start = Clock::now();
+        while (frames < kMaxSeconds * kRate) {
+            if (xmp_play_buffer(ctx_, buffer_.data(), static_cast<int>(buffer_.size() * 2), 1) != 0) break;
+            frames += kFrames;
+        }
+        r.work_seconds = std::chrono::duration<double>(Clock::now() - start).count();
+        r.audio_seconds = static_cast<double>(frames) / kRate;
+        xmp_end_player(ctx_);
+        return r;
+    }
+
+private:
+    xmp_context ctx_;
+    bool ok_ = false;
+    std::vector<int16_t> buffer_ = std::vector<int16_t>(2 * kFrames);
+};
 
 }  // namespace
 
@@ -148,10 +177,16 @@ int main(int argc, char** argv) {
     for (const auto& path : files) {
         std::ifstream in(path, std::ios::binary);
         std::vector<char> data((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-        const double song_seconds = ours(path.string()).audio_seconds;
-        const Run a = median_of(runs, [&] { return ours(path.string()); });
-        const Run b = median_of(runs, [&] { return openmpt(data); });
-        const Run c = median_of(runs, [&] { return libxmp(data); });
+        Ours ours(path.string());
+        Openmpt openmpt(data);
+        Xmp xmp(data);
+        // A first render of each, not counted, warms them alike.
+        const double song_seconds = ours.render().audio_seconds;
+        openmpt.render();
+        xmp.render();
+        const Run a = median_of(runs, [&] { return ours.render(); });
+        const Run b = median_of(runs, [&] { return openmpt.render(); });
+        const Run c = median_of(runs, [&] { return xmp.render(); });
         const double vs_openmpt = b.x() > 0 ? a.x() / b.x() : 0;
         const double vs_xmp = c.x() > 0 ? a.x() / c.x() : 0;
         const double fastest_peer = std::max(b.x(), c.x());

@@ -46,10 +46,12 @@ void Mixer::BufferProc(void*, void* buffer, unsigned long size, const AudioForma
 void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
     const bool measure = measure_load.load(std::memory_order_relaxed);
     const uint64_t entry = measure ? system_time_us() : 0;
-    std::fill(out, out + 2 * frames, 0.0f);
     nbpass.fetch_add(1, std::memory_order_relaxed);
     player_.service_audio_requests();
-    if (bank_.loadin.load(std::memory_order_acquire)) return;
+    if (bank_.loadin.load(std::memory_order_acquire)) {
+        std::fill(out, out + 2 * frames, 0.0f);
+        return;
+    }
 
     TMOD& m = bank_.current();
     const double tick = tick_frames();
@@ -119,6 +121,9 @@ void Mixer::number_routed_slots(const TMOD& m) {
 
 void Mixer::render_piece(float* out, int c0, int n, const TMOD& m, double frame_rate) {
     number_routed_slots(m);
+    // The first voice heard sets the piece's frames rather than adding to them (and clears
+    // what it leaves), which saves clearing the buffer first.
+    piece_has_setter_ = false;
     // In index order: the order decides which voice sets a slot's control value.
     for (int w = 0; w < kVoices / 64; ++w) {
         uint64_t& hint = player_.active_hint[w];
@@ -131,6 +136,7 @@ void Mixer::render_piece(float* out, int c0, int n, const TMOD& m, double frame_
                 hint &= ~(uint64_t{1} << b);
         }
     }
+    if (!piece_has_setter_) std::fill(out + 2 * c0, out + 2 * (c0 + n), 0.0f);
 }
 
 void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, double frame_rate) {
@@ -237,14 +243,18 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     const bool stereo = s->stereo != 0;
     const bool bits16 = s->bits == 16;
 
-    const StereoMixFn mix_stereo = stereo ? stereo_mixer(bits16) : nullptr;
-    const MonoMixFn mix_alone = stereo ? nullptr : mono_mixer(bits16, interpolate, send ? SendMode::First : SendMode::None);
-    const MonoMixFn mix_adding = send && !stereo ? mono_mixer(bits16, interpolate, SendMode::Add) : nullptr;
+    const bool sets = !piece_has_setter_ && !muted;
+    const OutMode out_mode = sets ? OutMode::Set : OutMode::Add;
+    const StereoMixFn mix_stereo = stereo ? stereo_mixer(bits16, out_mode) : nullptr;
+    const MonoMixFn mix_alone =
+        stereo ? nullptr : mono_mixer(bits16, interpolate, send ? SendMode::First : SendMode::None, out_mode);
+    const MonoMixFn mix_adding = send && !stereo ? mono_mixer(bits16, interpolate, SendMode::Add, out_mode) : nullptr;
 
     int64_t pos = v.position;
     double f = v.fraction;
     int m_left = n;
     float* o = out + 2 * c0;
+    bool keep_position = true;
     for (;;) {
         const int64_t adv = static_cast<int64_t>(step * m_left + f);
         if (pos >= end) {
@@ -260,14 +270,18 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
         if (count < 1) {
             if (!loop) {
                 v.active = 0;
-                return;
+                keep_position = false;
+                break;
             }
             if (count == 0) {
                 pos = loop_start;
                 v.position = static_cast<uint32_t>(pos);
                 count = frames_until_end();
             }
-            if (count < 1) return;  // frozen for this piece
+            if (count < 1) {  // frozen for this piece
+                keep_position = false;
+                break;
+            }
         }
         const int cnt = static_cast<int>(count);
         double x = f;
@@ -293,6 +307,11 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
         if (end <= pos && !loop) v.active = 0;
         break;
     }
+    if (sets && o > out + 2 * c0) {
+        piece_has_setter_ = true;
+        std::fill(o, out + 2 * (c0 + n), 0.0f);  // before any other voice adds there
+    }
+    if (!keep_position) return;
     v.position = static_cast<uint32_t>(pos);
     v.fraction = static_cast<float>(f);
 }

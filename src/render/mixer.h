@@ -76,6 +76,7 @@ private:
     std::array<int16_t, kEffectSlots> routed_by_slot_{};  // the same, by slot number
     int routed_by_slot_count_ = 0;
     std::array<int16_t, 8192> bufferrecmusic_{};
+    bool piece_has_setter_ = false;  // a voice has set the current piece's frames
 };
 
 }  // namespace ondrel

@@ -13,7 +13,7 @@ inline float sample_at(const S* d, int64_t i) {
     return static_cast<float>(d[i]);
 }
 
-template <typename S, bool Interpolate, SendMode Send>
+template <typename S, bool Interpolate, SendMode Send, OutMode Out>
 double mix_mono(const void* data, int64_t pos, double f, double step, int count, float* out, float* send,
                 const MixGains& g) {
     const S* d = static_cast<const S*>(data) + pos;
@@ -25,22 +25,29 @@ double mix_mono(const void* data, int64_t pos, double f, double step, int count,
             const float b = sample_at(d, whole + 1);  // the slack after the data covers the end
             s = s + (b - s) * static_cast<float>(x - static_cast<double>(whole));
         }
-        out[2 * i] += s * g.left;
-        out[2 * i + 1] += s * g.right;
+        if constexpr (Out == OutMode::Set) {
+            out[2 * i] = s * g.left;
+            out[2 * i + 1] = s * g.right;
+        } else {
+            out[2 * i] += s * g.left;
+            out[2 * i + 1] += s * g.right;
+        }
         if constexpr (Send == SendMode::First) send[i] = s * g.send;
         if constexpr (Send == SendMode::Add) send[i] += s * g.send;
     }
     return f + count * step;
 }
 
-template <typename S>
+template <typename S, OutMode Out>
 double mix_stereo(const void* data, int64_t pos, double f, double step, int count, float* out,
                   const MixGains& g) {
     const S* d = static_cast<const S*>(data) + 2 * pos;
     for (int i = 0; i < count; ++i) {
         const int64_t whole = static_cast<int64_t>(f + i * step);
-        out[2 * i] += g.left * sample_at(d, 2 * whole);
-        out[2 * i + 1] += g.right * sample_at(d, 2 * whole + 1);
+        const float l = g.left * sample_at(d, 2 * whole);
+        const float r = g.right * sample_at(d, 2 * whole + 1);
+        out[2 * i] = Out == OutMode::Set ? l : out[2 * i] + l;
+        out[2 * i + 1] = Out == OutMode::Set ? r : out[2 * i + 1] + r;
     }
     return f + count * step;
 }
@@ -50,29 +57,40 @@ bool has_avx2() {
     return yes;
 }
 
-template <typename S>
+template <typename S, OutMode Out>
 MonoMixFn pick_mono(bool interpolate, SendMode send) {
     switch (send) {
         case SendMode::None:
-            return interpolate ? mix_mono<S, true, SendMode::None> : mix_mono<S, false, SendMode::None>;
+            return interpolate ? mix_mono<S, true, SendMode::None, Out> : mix_mono<S, false, SendMode::None, Out>;
         case SendMode::First:
-            return interpolate ? mix_mono<S, true, SendMode::First> : mix_mono<S, false, SendMode::First>;
+            return interpolate ? mix_mono<S, true, SendMode::First, Out> : mix_mono<S, false, SendMode::First, Out>;
         case SendMode::Add:
-            return interpolate ? mix_mono<S, true, SendMode::Add> : mix_mono<S, false, SendMode::Add>;
+            return interpolate ? mix_mono<S, true, SendMode::Add, Out> : mix_mono<S, false, SendMode::Add, Out>;
     }
     return nullptr;
 }
 
-}  // namespace
-
-MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, bool vector) {
-    if (vector && has_avx2()) return mono_mixer_avx2(bits16, interpolate, send);
-    return bits16 ? pick_mono<sample16_t>(interpolate, send) : pick_mono<int8_t>(interpolate, send);
+template <OutMode Out>
+MonoMixFn pick_mono(bool bits16, bool interpolate, SendMode send) {
+    return bits16 ? pick_mono<sample16_t, Out>(interpolate, send) : pick_mono<int8_t, Out>(interpolate, send);
 }
 
-StereoMixFn stereo_mixer(bool bits16, bool vector) {
-    if (vector && has_avx2()) return stereo_mixer_avx2(bits16);
-    return bits16 ? mix_stereo<sample16_t> : mix_stereo<int8_t>;
+template <OutMode Out>
+StereoMixFn pick_stereo(bool bits16) {
+    return bits16 ? mix_stereo<sample16_t, Out> : mix_stereo<int8_t, Out>;
+}
+
+}  // namespace
+
+MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, bool vector) {
+    if (vector && has_avx2()) return mono_mixer_avx2(bits16, interpolate, send, out);
+    return out == OutMode::Set ? pick_mono<OutMode::Set>(bits16, interpolate, send)
+                               : pick_mono<OutMode::Add>(bits16, interpolate, send);
+}
+
+StereoMixFn stereo_mixer(bool bits16, OutMode out, bool vector) {
+    if (vector && has_avx2()) return stereo_mixer_avx2(bits16, out);
+    return out == OutMode::Set ? pick_stereo<OutMode::Set>(bits16) : pick_stereo<OutMode::Add>(bits16);
 }
 
 }  // namespace ondrel

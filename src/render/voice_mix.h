@@ -8,6 +8,8 @@ namespace ondrel {
 typedef int16_t __attribute__((may_alias)) sample16_t;  // sample data lives in a byte block
 
 enum class SendMode { None, First, Add };
+// Set: the first voice of a piece writes the output, the others add to it.
+enum class OutMode { Add, Set };
 
 struct MixGains {
     float left;
@@ -25,7 +27,7 @@ using StereoMixFn = double (*)(const void* data, int64_t pos, double x, double s
 
 // The loop for a case; bits16 selects 16-bit data. The vector loops are used where the CPU
 // has them unless vector is false.
-MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, bool vector = true);
-StereoMixFn stereo_mixer(bool bits16, bool vector = true);
+MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, bool vector = true);
+StereoMixFn stereo_mixer(bool bits16, OutMode out, bool vector = true);
 
 }  // namespace ondrel

@@ -20,22 +20,32 @@ ONDREL_AVX2 __m256i lanes_below(int n) {
     return _mm256_cmpgt_epi32(_mm256_set1_epi32(n), _mm256_setr_epi32(0, 1, 2, 3, 4, 5, 6, 7));
 }
 
-// Adds eight stereo frames, given as [f0 f1 | f4 f5] and [f2 f3 | f6 f7] (two floats
-// each), into out at the gains; only the first n frames when Masked.
-template <bool Masked>
-ONDREL_AVX2 void add_frames8(__m256 lo, __m256 hi, float* out, __m256 gains, int n) {
-    const __m256 first = _mm256_permute2f128_ps(lo, hi, 0x20);
-    const __m256 second = _mm256_permute2f128_ps(lo, hi, 0x31);
+// out (8 floats) plus, or set to, v x gains; only the lanes in mask when Masked.
+template <bool Masked, OutMode Out>
+ONDREL_AVX2 void put8(float* out, __m256 v, __m256 gains, __m256i mask) {
+    __m256 r;
+    if constexpr (Out == OutMode::Set)
+        r = _mm256_mul_ps(v, gains);
+    else
+        r = _mm256_fmadd_ps(v, gains, Masked ? _mm256_maskload_ps(out, mask) : _mm256_loadu_ps(out));
+    if constexpr (Masked)
+        _mm256_maskstore_ps(out, mask, r);
+    else
+        _mm256_storeu_ps(out, r);
+}
+
+// Eight stereo frames, given as [f0 f1 | f4 f5] and [f2 f3 | f6 f7] (two floats each),
+// into out at the gains; only the first n frames when Masked.
+template <bool Masked, OutMode Out>
+ONDREL_AVX2 void put_frames8(__m256 lo, __m256 hi, float* out, __m256 gains, int n) {
+    __m256i m1 = _mm256_set1_epi32(-1), m2 = m1;
     if constexpr (Masked) {
         const __m256i n2 = _mm256_set1_epi32(2 * n);
-        const __m256i m1 = _mm256_cmpgt_epi32(n2, _mm256_setr_epi32(0, 1, 2, 3, 4, 5, 6, 7));
-        const __m256i m2 = _mm256_cmpgt_epi32(n2, _mm256_setr_epi32(8, 9, 10, 11, 12, 13, 14, 15));
-        _mm256_maskstore_ps(out, m1, _mm256_fmadd_ps(first, gains, _mm256_maskload_ps(out, m1)));
-        _mm256_maskstore_ps(out + 8, m2, _mm256_fmadd_ps(second, gains, _mm256_maskload_ps(out + 8, m2)));
-    } else {
-        _mm256_storeu_ps(out, _mm256_fmadd_ps(first, gains, _mm256_loadu_ps(out)));
-        _mm256_storeu_ps(out + 8, _mm256_fmadd_ps(second, gains, _mm256_loadu_ps(out + 8)));
+        m1 = _mm256_cmpgt_epi32(n2, _mm256_setr_epi32(0, 1, 2, 3, 4, 5, 6, 7));
+        m2 = _mm256_cmpgt_epi32(n2, _mm256_setr_epi32(8, 9, 10, 11, 12, 13, 14, 15));
     }
+    put8<Masked, Out>(out, _mm256_permute2f128_ps(lo, hi, 0x20), gains, m1);
+    put8<Masked, Out>(out + 8, _mm256_permute2f128_ps(lo, hi, 0x31), gains, m2);
 }
 
 // ---- Mono ----------------------------------------------------------------------------
@@ -81,7 +91,7 @@ ONDREL_AVX2 __m256 mono_samples8(const S* d, __m256 x, __m256i whole, __m256i la
     return _mm256_fmadd_ps(_mm256_sub_ps(b, a), _mm256_sub_ps(x, _mm256_cvtepi32_ps(whole)), a);
 }
 
-template <int Span, typename S, bool Interpolate, SendMode Send>
+template <int Span, typename S, bool Interpolate, SendMode Send, OutMode Out>
 struct MonoGroups {
     const S* d;
     float* out;
@@ -95,7 +105,7 @@ struct MonoGroups {
         const __m256i whole = _mm256_cvttps_epi32(x);
         const __m256i mask = Masked ? lanes_below(n) : _mm256_set1_epi32(-1);
         const __m256 s = mono_samples8<Span, S, Interpolate>(d, x, whole, mask);
-        add_frames8<Masked>(_mm256_unpacklo_ps(s, s), _mm256_unpackhi_ps(s, s), out + 2 * i, gains, n);
+        put_frames8<Masked, Out>(_mm256_unpacklo_ps(s, s), _mm256_unpackhi_ps(s, s), out + 2 * i, gains, n);
         if constexpr (Send != SendMode::None) {
             const __m256 old = Send == SendMode::Add ? _mm256_maskload_ps(send + i, mask) : _mm256_setzero_ps();
             const __m256 sent = _mm256_fmadd_ps(s, gsend, old);
@@ -115,10 +125,10 @@ struct MonoGroups {
     }
 };
 
-template <int Span, typename S, bool Interpolate, SendMode Send>
+template <int Span, typename S, bool Interpolate, SendMode Send, OutMode Out>
 ONDREL_AVX2 void mono_groups(const S* d, float f, float step, int count, float* out, float* send,
                              const MixGains& g) {
-    const MonoGroups<Span, S, Interpolate, Send> groups{
+    const MonoGroups<Span, S, Interpolate, Send, Out> groups{
         d,
         out,
         send,
@@ -129,18 +139,18 @@ ONDREL_AVX2 void mono_groups(const S* d, float f, float step, int count, float* 
     groups.run(count);
 }
 
-template <typename S, bool Interpolate, SendMode Send>
+template <typename S, bool Interpolate, SendMode Send, OutMode Out>
 __attribute__((target("avx2,fma"))) double mix_mono(const void* data, int64_t pos, double f, double step,
                                                     int count, float* out, float* send, const MixGains& g) {
     const S* d = static_cast<const S*>(data) + pos;
     const float ff = static_cast<float>(f);
     const float fstep = static_cast<float>(step);
     if (fstep < kSpanStep)
-        mono_groups<1, S, Interpolate, Send>(d, ff, fstep, count, out, send, g);
+        mono_groups<1, S, Interpolate, Send, Out>(d, ff, fstep, count, out, send, g);
     else if (fstep < 2 * kSpanStep)
-        mono_groups<2, S, Interpolate, Send>(d, ff, fstep, count, out, send, g);
+        mono_groups<2, S, Interpolate, Send, Out>(d, ff, fstep, count, out, send, g);
     else
-        mono_groups<kGather, S, Interpolate, Send>(d, ff, fstep, count, out, send, g);
+        mono_groups<kGather, S, Interpolate, Send, Out>(d, ff, fstep, count, out, send, g);
     return f + count * step;
 }
 
@@ -172,7 +182,7 @@ ONDREL_AVX2 __m256i stereo_frames8(const S* d, __m256i whole, __m256i lanes_mask
     }
 }
 
-template <int Span, typename S>
+template <int Span, typename S, OutMode Out>
 struct StereoGroups {
     const S* d;
     float* out;
@@ -191,7 +201,7 @@ struct StereoGroups {
         const __m256 l = _mm256_cvtepi32_ps(_mm256_srai_epi32(_mm256_slli_epi32(frames, 32 - kBits), 32 - kBits));
         const __m256 r =
             _mm256_cvtepi32_ps(_mm256_srai_epi32(_mm256_slli_epi32(frames, 32 - 2 * kBits), 32 - kBits));
-        add_frames8<Masked>(_mm256_unpacklo_ps(l, r), _mm256_unpackhi_ps(l, r), out + 2 * i, gains, n);
+        put_frames8<Masked, Out>(_mm256_unpacklo_ps(l, r), _mm256_unpackhi_ps(l, r), out + 2 * i, gains, n);
     }
 
     ONDREL_AVX2 void run(int count) const {
@@ -203,46 +213,59 @@ struct StereoGroups {
     }
 };
 
-template <int Span, typename S>
+template <int Span, typename S, OutMode Out>
 ONDREL_AVX2 void stereo_groups(const S* d, double f, double step, int count, float* out, const MixGains& g) {
-    const StereoGroups<Span, S> groups{
+    const StereoGroups<Span, S, Out> groups{
         d, out, _mm256_set1_pd(f), _mm256_set1_pd(step),
         _mm256_setr_ps(g.left, g.right, g.left, g.right, g.left, g.right, g.left, g.right)};
     groups.run(count);
 }
 
-template <typename S>
+template <typename S, OutMode Out>
 __attribute__((target("avx2,fma"))) double mix_stereo(const void* data, int64_t pos, double f, double step,
                                                       int count, float* out, const MixGains& g) {
     const S* d = static_cast<const S*>(data) + 2 * pos;
     if (step < kSpanStep)
-        stereo_groups<1>(d, f, step, count, out, g);
+        stereo_groups<1, S, Out>(d, f, step, count, out, g);
     else if (step < 2 * kSpanStep)
-        stereo_groups<2>(d, f, step, count, out, g);
+        stereo_groups<2, S, Out>(d, f, step, count, out, g);
     else
-        stereo_groups<kGather>(d, f, step, count, out, g);
+        stereo_groups<kGather, S, Out>(d, f, step, count, out, g);
     return f + count * step;
 }
 
-template <typename S>
+template <typename S, OutMode Out>
 MonoMixFn pick_mono(bool interpolate, SendMode send) {
     switch (send) {
         case SendMode::None:
-            return interpolate ? mix_mono<S, true, SendMode::None> : mix_mono<S, false, SendMode::None>;
+            return interpolate ? mix_mono<S, true, SendMode::None, Out> : mix_mono<S, false, SendMode::None, Out>;
         case SendMode::First:
-            return interpolate ? mix_mono<S, true, SendMode::First> : mix_mono<S, false, SendMode::First>;
+            return interpolate ? mix_mono<S, true, SendMode::First, Out> : mix_mono<S, false, SendMode::First, Out>;
         case SendMode::Add:
-            return interpolate ? mix_mono<S, true, SendMode::Add> : mix_mono<S, false, SendMode::Add>;
+            return interpolate ? mix_mono<S, true, SendMode::Add, Out> : mix_mono<S, false, SendMode::Add, Out>;
     }
     return nullptr;
 }
 
-}  // namespace
-
-MonoMixFn mono_mixer_avx2(bool bits16, bool interpolate, SendMode send) {
-    return bits16 ? pick_mono<sample16_t>(interpolate, send) : pick_mono<int8_t>(interpolate, send);
+template <OutMode Out>
+MonoMixFn pick_mono(bool bits16, bool interpolate, SendMode send) {
+    return bits16 ? pick_mono<sample16_t, Out>(interpolate, send) : pick_mono<int8_t, Out>(interpolate, send);
 }
 
-StereoMixFn stereo_mixer_avx2(bool bits16) { return bits16 ? mix_stereo<sample16_t> : mix_stereo<int8_t>; }
+template <OutMode Out>
+StereoMixFn pick_stereo(bool bits16) {
+    return bits16 ? mix_stereo<sample16_t, Out> : mix_stereo<int8_t, Out>;
+}
+
+}  // namespace
+
+MonoMixFn mono_mixer_avx2(bool bits16, bool interpolate, SendMode send, OutMode out) {
+    return out == OutMode::Set ? pick_mono<OutMode::Set>(bits16, interpolate, send)
+                               : pick_mono<OutMode::Add>(bits16, interpolate, send);
+}
+
+StereoMixFn stereo_mixer_avx2(bool bits16, OutMode out) {
+    return out == OutMode::Set ? pick_stereo<OutMode::Set>(bits16) : pick_stereo<OutMode::Add>(bits16);
+}
 
 }  // namespace ondrel

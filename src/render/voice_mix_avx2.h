@@ -4,7 +4,7 @@
 
 namespace ondrel {
 
-MonoMixFn mono_mixer_avx2(bool bits16, bool interpolate, SendMode send);
-StereoMixFn stereo_mixer_avx2(bool bits16);
+MonoMixFn mono_mixer_avx2(bool bits16, bool interpolate, SendMode send, OutMode out);
+StereoMixFn stereo_mixer_avx2(bool bits16, OutMode out);
 
 }  // namespace ondrel

@@ -55,8 +55,10 @@ protected:
         player.polytotrack[voice] = static_cast<int16_t>(track);
         return v;
     }
+    // The buffer starts with a value no frame should keep: the mixer writes every frame.
+    static constexpr float kStale = 9.0f;
     std::vector<float> render(int frames, uint32_t format = kFormatFloat) {
-        std::vector<float> out(2 * static_cast<size_t>(frames), 0.0f);
+        std::vector<float> out(2 * static_cast<size_t>(frames), kStale);
         mixer.BufferProc(nullptr, out.data(), out.size() * 4, AudioFormat{44100.0f, 2, format});
         return out;
     }

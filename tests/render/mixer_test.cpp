@@ -113,6 +113,26 @@ TEST_F(Mix, OneShotSampleEndsOnItsLastFrame) {
     EXPECT_EQ(v.active, 0);
 }
 
+TEST_F(Mix, VoicesAddOverOneThatEndedOrIsMuted) {
+    // The first voice sets the frames it plays; the frames after its end must be silence
+    // before the next voice adds to them, and a muted voice sets nothing.
+    sample8(1, std::vector<int8_t>(4, 30));
+    sample8(2, std::vector<int8_t>(100, 20));
+    sample8(3, std::vector<int8_t>(100, 10));
+    start_voice(0, 1, 1.0, 0);
+    start_voice(1, 2, 1.0, 1);
+    start_voice(2, 3, 1.0, 2);
+    mixer.mute[2] = 1;
+    auto out = render(12);
+    for (int i = 0; i < 4; ++i) EXPECT_NEAR(left(out, i), centred(30) + centred(20), kTol) << i;
+    for (int i = 4; i < 12; ++i) EXPECT_NEAR(left(out, i), centred(20), kTol) << i;
+
+    mixer.mute[2] = 0;
+    mixer.mute[1] = 1;  // the first voice heard is now the third
+    out = render(4);
+    for (int i = 0; i < 4; ++i) EXPECT_NEAR(right(out, i), centred_right(10), kTol) << i;
+}
+
 TEST_F(Mix, VoiceBelowPeriodTwoIsFrozen) {
     sample8(1, std::vector<int8_t>(100, 30));
     Voice& v = start_voice(0, 1);

@@ -1,4 +1,4 @@
-// Every mix loop (vector and scalar, each sample width, interpolation and send mode)
+// Every mix loop (vector and scalar, each sample width, interpolation, send and output mode)
 // against a plain reference, over steps on both sides of the vector loops' regimes.
 #include <gtest/gtest.h>
 
@@ -52,13 +52,14 @@ struct Case {
     bool bits16;
     bool interpolate;
     SendMode send;
+    OutMode out;
     bool vector;
 };
 
 template <typename S>
 void check_mono(const Case& c, double f, double step, int count) {
     SCOPED_TRACE(testing::Message() << "bits16 " << c.bits16 << " interpolate " << c.interpolate << " send "
-                                    << static_cast<int>(c.send) << " vector " << c.vector << " f " << f
+                                    << static_cast<int>(c.send) << " set " << (c.out == OutMode::Set) << " vector " << c.vector << " f " << f
                                     << " step " << step << " count " << count);
     const int frames = static_cast<int>(std::floor(f + (count - 1) * step)) + 1;
     const Data d = random_data<S>(frames, 1, static_cast<uint32_t>(count * 7919 + frames));
@@ -68,7 +69,7 @@ void check_mono(const Case& c, double f, double step, int count) {
     const std::vector<float> out0 = out, send0 = send;
     const MixGains g{0.25f, -0.5f, 0.125f};
 
-    const double end = mono_mixer(c.bits16, c.interpolate, c.send, c.vector)(
+    const double end = mono_mixer(c.bits16, c.interpolate, c.send, c.out, c.vector)(
         d.data(), 0, f, step, count, out.data(), c.send == SendMode::None ? nullptr : send.data(), g);
     EXPECT_NEAR(end, f + count * step, 1e-9);
 
@@ -79,8 +80,10 @@ void check_mono(const Case& c, double f, double step, int count) {
         const float s = c.interpolate ? a + (b - a) * static_cast<float>(x - whole) : a;
         // Rounding of the neighbours' sum, far below one step of a sample's value.
         const float tolerance = 1e-5f * (std::fabs(a) + std::fabs(b)) + 1e-4f;
-        ASSERT_NEAR(out[2 * i], out0[2 * i] + s * g.left, tolerance) << "frame " << i;
-        ASSERT_NEAR(out[2 * i + 1], out0[2 * i + 1] + s * g.right, tolerance) << "frame " << i;
+        const float base_left = c.out == OutMode::Set ? 0.0f : out0[2 * i];
+        const float base_right = c.out == OutMode::Set ? 0.0f : out0[2 * i + 1];
+        ASSERT_NEAR(out[2 * i], base_left + s * g.left, tolerance) << "frame " << i;
+        ASSERT_NEAR(out[2 * i + 1], base_right + s * g.right, tolerance) << "frame " << i;
         float sent = send0[i];
         if (c.send == SendMode::First) sent = s * g.send;
         if (c.send == SendMode::Add) sent = send0[i] + s * g.send;
@@ -100,45 +103,48 @@ TEST(MixLoops, MonoMatchesTheReferenceInEveryCase) {
         for (bool bits16 : {false, true})
             for (bool interpolate : {false, true})
                 for (SendMode send : {SendMode::None, SendMode::First, SendMode::Add})
-                    for (double step : kSteps)
-                        for (double f : kStarts)
-                            for (int count : kCounts) {
-                                const Case c{bits16, interpolate, send, vector};
-                                if (bits16)
-                                    check_mono<int16_t>(c, f, step, count);
-                                else
-                                    check_mono<int8_t>(c, f, step, count);
-                                if (HasFatalFailure()) return;
-                            }
+                    for (OutMode out : {OutMode::Add, OutMode::Set})
+                        for (double step : kSteps)
+                            for (double f : kStarts)
+                                for (int count : kCounts) {
+                                    const Case c{bits16, interpolate, send, out, vector};
+                                    if (bits16)
+                                        check_mono<int16_t>(c, f, step, count);
+                                    else
+                                        check_mono<int8_t>(c, f, step, count);
+                                    if (HasFatalFailure()) return;
+                                }
 }
 
 template <typename S>
-void check_stereo(bool vector, double f, double step, int count) {
-    SCOPED_TRACE(testing::Message() << "stereo bits " << 8 * sizeof(S) << " vector " << vector << " f " << f
-                                    << " step " << step << " count " << count);
+void check_stereo(OutMode mode, bool vector, double f, double step, int count) {
+    SCOPED_TRACE(testing::Message() << "stereo bits " << 8 * sizeof(S) << " set " << (mode == OutMode::Set)
+                                    << " vector " << vector << " f " << f << " step " << step << " count " << count);
     const int frames = static_cast<int>(std::floor(f + (count - 1) * step)) + 1;
     const Data d = random_data<S>(frames, 2, static_cast<uint32_t>(count + 31 * frames));
     std::vector<float> out(2 * count + 2, 1.0f);
     const MixGains g{0.5f, 0.75f, 0.0f};
-    const double end = stereo_mixer(sizeof(S) == 2, vector)(d.data(), 0, f, step, count, out.data(), g);
+    const double end = stereo_mixer(sizeof(S) == 2, mode, vector)(d.data(), 0, f, step, count, out.data(), g);
+    const float base = mode == OutMode::Set ? 0.0f : 1.0f;
     EXPECT_NEAR(end, f + count * step, 1e-9);
     for (int i = 0; i < count; ++i) {
         const int64_t whole = static_cast<int64_t>(f + i * step);  // stereo offsets stay in double
-        ASSERT_FLOAT_EQ(out[2 * i], 1.0f + at<S>(d, 2 * whole) * g.left) << "frame " << i;
-        ASSERT_FLOAT_EQ(out[2 * i + 1], 1.0f + at<S>(d, 2 * whole + 1) * g.right) << "frame " << i;
+        ASSERT_FLOAT_EQ(out[2 * i], base + at<S>(d, 2 * whole) * g.left) << "frame " << i;
+        ASSERT_FLOAT_EQ(out[2 * i + 1], base + at<S>(d, 2 * whole + 1) * g.right) << "frame " << i;
     }
     EXPECT_EQ(out[2 * count], 1.0f);
 }
 
 TEST(MixLoops, StereoKeepsEachChannelInEveryCase) {
     for (bool vector : {true, false})
-        for (double step : kSteps)
-            for (double f : kStarts)
-                for (int count : kCounts) {
-                    check_stereo<int8_t>(vector, f, step, count);
-                    check_stereo<int16_t>(vector, f, step, count);
-                    if (HasFatalFailure()) return;
-                }
+        for (OutMode mode : {OutMode::Add, OutMode::Set})
+            for (double step : kSteps)
+                for (double f : kStarts)
+                    for (int count : kCounts) {
+                        check_stereo<int8_t>(mode, vector, f, step, count);
+                        check_stereo<int16_t>(mode, vector, f, step, count);
+                        if (HasFatalFailure()) return;
+                    }
 }
 
 }  // namespace
