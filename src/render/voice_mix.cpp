@@ -1,6 +1,6 @@
 #include "render/voice_mix.h"
 
-#include "render/voice_mix_avx2.h"
+#include "render/voice_mix_simd.h"
 
 namespace ondrel {
 
@@ -57,6 +57,11 @@ bool has_avx2() {
     return yes;
 }
 
+bool has_avx512() {
+    static const bool yes = has_avx2() && __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512vl");
+    return yes;
+}
+
 template <typename S, OutMode Out>
 MonoMixFn pick_mono(bool interpolate, SendMode send) {
     switch (send) {
@@ -82,14 +87,25 @@ StereoMixFn pick_stereo(bool bits16) {
 
 }  // namespace
 
-MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, bool vector) {
-    if (vector && has_avx2()) return mono_mixer_avx2(bits16, interpolate, send, out);
+bool cpu_runs(LoopSet set) {
+    switch (set) {
+        case LoopSet::Best:
+        case LoopSet::Portable: return true;
+        case LoopSet::Avx2: return has_avx2();
+    }
+    return false;
+}
+
+MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, LoopSet set) {
+    if (set == LoopSet::Best && has_avx512()) return avx512::mono_mixer(bits16, interpolate, send, out);
+    if (set != LoopSet::Portable && has_avx2()) return avx2::mono_mixer(bits16, interpolate, send, out);
     return out == OutMode::Set ? pick_mono<OutMode::Set>(bits16, interpolate, send)
                                : pick_mono<OutMode::Add>(bits16, interpolate, send);
 }
 
-StereoMixFn stereo_mixer(bool bits16, OutMode out, bool vector) {
-    if (vector && has_avx2()) return stereo_mixer_avx2(bits16, out);
+StereoMixFn stereo_mixer(bool bits16, OutMode out, LoopSet set) {
+    if (set == LoopSet::Best && has_avx512()) return avx512::stereo_mixer(bits16, out);
+    if (set != LoopSet::Portable && has_avx2()) return avx2::stereo_mixer(bits16, out);
     return out == OutMode::Set ? pick_stereo<OutMode::Set>(bits16) : pick_stereo<OutMode::Add>(bits16);
 }
 

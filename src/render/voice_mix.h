@@ -25,9 +25,13 @@ using MonoMixFn = double (*)(const void* data, int64_t pos, double x, double ste
 using StereoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count, float* out,
                                const MixGains& g);
 
-// The loop for a case; bits16 selects 16-bit data. The vector loops are used where the CPU
-// has them unless vector is false.
-MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, bool vector = true);
-StereoMixFn stereo_mixer(bool bits16, OutMode out, bool vector = true);
+// The sets of loops: the best this CPU runs, or a lesser one (for tests and comparisons).
+enum class LoopSet { Best, Avx2, Portable };
+bool cpu_runs(LoopSet set);
+
+// The loop for a case; bits16 selects 16-bit data. A set the CPU cannot run gives the
+// portable loops.
+MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, LoopSet set = LoopSet::Best);
+StereoMixFn stereo_mixer(bool bits16, OutMode out, LoopSet set = LoopSet::Best);
 
 }  // namespace ondrel

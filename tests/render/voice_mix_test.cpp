@@ -1,5 +1,5 @@
-// Every mix loop (vector and scalar, each sample width, interpolation, send and output mode)
-// against a plain reference, over steps on both sides of the vector loops' regimes.
+// Every set of mix loops the CPU runs (each sample width, interpolation, send and output
+// mode) against a plain reference, over steps on both sides of the vector regimes.
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -41,9 +41,9 @@ float at(const Data& d, int64_t i) {
 }
 
 // The read offset of frame i: in single precision for the vector loops (each operation
-// rounded to float, whatever the compiler fuses here), double for the scalar ones.
-double offset(bool vector, double f, double step, int i) {
-    if (!vector) return f + i * step;
+// rounded to float, whatever the compiler fuses here), double for the portable ones.
+double offset(LoopSet set, double f, double step, int i) {
+    if (set == LoopSet::Portable) return f + i * step;
     const float product = static_cast<float>(static_cast<double>(i) * static_cast<float>(step));
     return static_cast<float>(static_cast<double>(static_cast<float>(f)) + product);
 }
@@ -53,13 +53,13 @@ struct Case {
     bool interpolate;
     SendMode send;
     OutMode out;
-    bool vector;
+    LoopSet set;
 };
 
 template <typename S>
 void check_mono(const Case& c, double f, double step, int count) {
     SCOPED_TRACE(testing::Message() << "bits16 " << c.bits16 << " interpolate " << c.interpolate << " send "
-                                    << static_cast<int>(c.send) << " set " << (c.out == OutMode::Set) << " vector " << c.vector << " f " << f
+                                    << static_cast<int>(c.send) << " set " << (c.out == OutMode::Set) << " loops " << static_cast<int>(c.set) << " f " << f
                                     << " step " << step << " count " << count);
     const int frames = static_cast<int>(std::floor(f + (count - 1) * step)) + 1;
     const Data d = random_data<S>(frames, 1, static_cast<uint32_t>(count * 7919 + frames));
@@ -69,12 +69,12 @@ void check_mono(const Case& c, double f, double step, int count) {
     const std::vector<float> out0 = out, send0 = send;
     const MixGains g{0.25f, -0.5f, 0.125f};
 
-    const double end = mono_mixer(c.bits16, c.interpolate, c.send, c.out, c.vector)(
+    const double end = mono_mixer(c.bits16, c.interpolate, c.send, c.out, c.set)(
         d.data(), 0, f, step, count, out.data(), c.send == SendMode::None ? nullptr : send.data(), g);
     EXPECT_NEAR(end, f + count * step, 1e-9);
 
     for (int i = 0; i < count; ++i) {
-        const double x = offset(c.vector, f, step, i);
+        const double x = offset(c.set, f, step, i);
         const int64_t whole = static_cast<int64_t>(x);
         const float a = at<S>(d, whole), b = at<S>(d, whole + 1);
         const float s = c.interpolate ? a + (b - a) * static_cast<float>(x - whole) : a;
@@ -98,8 +98,16 @@ const double kSteps[] = {0.0, 0.19, 0.5, 0.98, 0.995, 1.5, 1.97, 1.985, 2.6, 7.3
 const double kStarts[] = {0.0, 0.73};
 const int kCounts[] = {1, 7, 8, 9, 17, 883, 4096};
 
+// Every set of loops this CPU runs.
+std::vector<LoopSet> loop_sets() {
+    std::vector<LoopSet> sets;
+    for (LoopSet set : {LoopSet::Best, LoopSet::Avx2, LoopSet::Portable})
+        if (cpu_runs(set)) sets.push_back(set);
+    return sets;
+}
+
 TEST(MixLoops, MonoMatchesTheReferenceInEveryCase) {
-    for (bool vector : {true, false})
+    for (LoopSet set : loop_sets())
         for (bool bits16 : {false, true})
             for (bool interpolate : {false, true})
                 for (SendMode send : {SendMode::None, SendMode::First, SendMode::Add})
@@ -107,7 +115,7 @@ TEST(MixLoops, MonoMatchesTheReferenceInEveryCase) {
                         for (double step : kSteps)
                             for (double f : kStarts)
                                 for (int count : kCounts) {
-                                    const Case c{bits16, interpolate, send, out, vector};
+                                    const Case c{bits16, interpolate, send, out, set};
                                     if (bits16)
                                         check_mono<int16_t>(c, f, step, count);
                                     else
@@ -117,14 +125,15 @@ TEST(MixLoops, MonoMatchesTheReferenceInEveryCase) {
 }
 
 template <typename S>
-void check_stereo(OutMode mode, bool vector, double f, double step, int count) {
+void check_stereo(OutMode mode, LoopSet set, double f, double step, int count) {
     SCOPED_TRACE(testing::Message() << "stereo bits " << 8 * sizeof(S) << " set " << (mode == OutMode::Set)
-                                    << " vector " << vector << " f " << f << " step " << step << " count " << count);
+                                    << " loops " << static_cast<int>(set) << " f " << f << " step " << step
+                                    << " count " << count);
     const int frames = static_cast<int>(std::floor(f + (count - 1) * step)) + 1;
     const Data d = random_data<S>(frames, 2, static_cast<uint32_t>(count + 31 * frames));
     std::vector<float> out(2 * count + 2, 1.0f);
     const MixGains g{0.5f, 0.75f, 0.0f};
-    const double end = stereo_mixer(sizeof(S) == 2, mode, vector)(d.data(), 0, f, step, count, out.data(), g);
+    const double end = stereo_mixer(sizeof(S) == 2, mode, set)(d.data(), 0, f, step, count, out.data(), g);
     const float base = mode == OutMode::Set ? 0.0f : 1.0f;
     EXPECT_NEAR(end, f + count * step, 1e-9);
     for (int i = 0; i < count; ++i) {
@@ -136,13 +145,13 @@ void check_stereo(OutMode mode, bool vector, double f, double step, int count) {
 }
 
 TEST(MixLoops, StereoKeepsEachChannelInEveryCase) {
-    for (bool vector : {true, false})
+    for (LoopSet set : loop_sets())
         for (OutMode mode : {OutMode::Add, OutMode::Set})
             for (double step : kSteps)
                 for (double f : kStarts)
                     for (int count : kCounts) {
-                        check_stereo<int8_t>(mode, vector, f, step, count);
-                        check_stereo<int16_t>(mode, vector, f, step, count);
+                        check_stereo<int8_t>(mode, set, f, step, count);
+                        check_stereo<int16_t>(mode, set, f, step, count);
                         if (HasFatalFailure()) return;
                     }
 }

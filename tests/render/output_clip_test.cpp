@@ -1,0 +1,44 @@
+// The output stage's headroom, clip and peak meters over lengths that reach every part of
+// the vector loops (whole blocks, single vectors, the masked or scalar rest).
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cmath>
+#include <random>
+#include <vector>
+
+#include "render/output_clip.h"
+
+namespace ondrel {
+namespace {
+
+TEST(OutputClip, QuartersClipsAndMetersEachChannel) {
+    std::mt19937 gen(7);
+    std::uniform_real_distribution<float> value(-6.0f, 6.0f);
+    for (int frames : {1, 3, 4, 7, 8, 9, 15, 16, 17, 31, 33, 1024, 1031}) {
+        SCOPED_TRACE(frames);
+        std::vector<float> out(2 * frames + 2, 0.0f);
+        for (int i = 0; i < 2 * frames; ++i) out[i] = value(gen);
+        out[2 * frames] = out[2 * frames + 1] = 42.0f;  // past the frames: left alone
+        // A lone loud value in the last frame's right channel: only the right meter sees it.
+        out[2 * frames - 1] = 3.9f;
+        out[2 * frames - 2] = 0.0f;
+        const std::vector<float> in = out;
+
+        const Peaks p = headroom_and_clip(out.data(), frames);
+        float left = 0, right = 0;
+        for (int i = 0; i < 2 * frames; ++i) {
+            const float expected = std::clamp(in[i] * 0.25f, -1.0f, 1.0f);
+            ASSERT_EQ(out[i], expected) << i;
+            (i % 2 ? right : left) = std::max(i % 2 ? right : left, std::fabs(expected));
+        }
+        EXPECT_EQ(p.left, left);
+        EXPECT_EQ(p.right, right);
+        EXPECT_GE(p.right, 0.975f);
+        EXPECT_EQ(out[2 * frames], 42.0f);
+        EXPECT_EQ(out[2 * frames + 1], 42.0f);
+    }
+}
+
+}  // namespace
+}  // namespace ondrel
