@@ -48,12 +48,18 @@ Run repeated(const RenderOnce& once) {
     return total;
 }
 
-// The median of runs, each of repeated renders.
-Run median_of(int runs, const RenderOnce& render) {
-    std::vector<Run> all;
-    for (int i = 0; i < runs; ++i) all.push_back(repeated(render));
-    std::sort(all.begin(), all.end(), [](const Run& a, const Run& b) { return a.x() < b.x(); });
-    return all[all.size() / 2];
+// The players take turns run by run, so that a slow spell of a shared machine falls on
+// all of them alike; each one's median run.
+std::vector<Run> medians_of(int runs, const std::vector<RenderOnce>& players) {
+    std::vector<std::vector<Run>> all(players.size());
+    for (int i = 0; i < runs; ++i)
+        for (size_t p = 0; p < players.size(); ++p) all[p].push_back(repeated(players[p]));
+    std::vector<Run> medians;
+    for (auto& runs_of_one : all) {
+        std::sort(runs_of_one.begin(), runs_of_one.end(), [](const Run& a, const Run& b) { return a.x() < b.x(); });
+        medians.push_back(runs_of_one[runs_of_one.size() / 2]);
+    }
+    return medians;
 }
 
 // Each player loads its module once (not timed), then renders it from the start as often
@@ -184,9 +190,9 @@ int main(int argc, char** argv) {
         const double song_seconds = ours.render().audio_seconds;
         openmpt.render();
         xmp.render();
-        const Run a = median_of(runs, [&] { return ours.render(); });
-        const Run b = median_of(runs, [&] { return openmpt.render(); });
-        const Run c = median_of(runs, [&] { return xmp.render(); });
+        const std::vector<Run> m = medians_of(
+            runs, {[&] { return ours.render(); }, [&] { return openmpt.render(); }, [&] { return xmp.render(); }});
+        const Run &a = m[0], &b = m[1], &c = m[2];
         const double vs_openmpt = b.x() > 0 ? a.x() / b.x() : 0;
         const double vs_xmp = c.x() > 0 ? a.x() / c.x() : 0;
         const double fastest_peer = std::max(b.x(), c.x());

@@ -123,9 +123,11 @@ void Player::gere_play() {
 
 void Player::watch_for_repeats(bool on) {
     // Only the rows of positions marked last time need clearing.
-    for (int p = 0; p < kPositions; ++p)
-        if (visited_positions_[p / 64] & (uint64_t{1} << (p % 64)))
+    for (size_t w = 0; w < visited_positions_.size(); ++w)
+        for (uint64_t bits = visited_positions_[w]; bits; bits &= bits - 1) {
+            const size_t p = w * 64 + static_cast<size_t>(__builtin_ctzll(bits));
             std::fill_n(visited_.begin() + p * kWordsPerPosition, kWordsPerPosition, 0);
+        }
     visited_positions_ = {};
     watching_ = on;
     repeated = false;

@@ -1,5 +1,6 @@
 #include "render/iir2_filter.h"
 
+#include <algorithm>
 #include <cmath>
 
 #include "render/denormal.h"
@@ -7,8 +8,11 @@
 namespace ondrel {
 
 void Iir2Filter::clear() {
-    for (auto* rows : {&tournex, &tourney, &tournex2, &tourney2})
-        for (auto& r : *rows) r.fill(0.0f);
+    std::fill_n(tournex.begin(), used16_, std::array<float, 4>{});
+    std::fill_n(tourney.begin(), used16_, std::array<float, 4>{});
+    std::fill_n(tournex2.begin(), used17_, std::array<float, 4>{});
+    std::fill_n(tourney2.begin(), used17_, std::array<float, 4>{});
+    used16_ = used17_ = 0;
 }
 
 void Iir2Filter::run(int type, int slot, const float* send, float* out, int frames, int control, int q,
@@ -19,6 +23,8 @@ void Iir2Filter::run(int type, int slot, const float* send, float* out, int fram
     auto& x = (high ? tournex2 : tournex)[next_row];
     auto& y = (high ? tourney2 : tourney)[next_row];
     ++next_row;
+    int& used = high ? used17_ : used16_;
+    used = std::max(used, next_row);
 
     double fc = control * 0.00390625 * 22040;
     if (fc == 0) fc = 100;

@@ -21,6 +21,7 @@ public:
 
 private:
     int row16_ = 0, row17_ = 0;
+    int used16_ = 0, used17_ = 0;  // rows run since the last clear, so clearing is cheap
 };
 
 }  // namespace ondrel
