@@ -54,24 +54,30 @@ void Reverb::compute(const float* in, float* out, long frames, float gain_left, 
     const float g1 = allpass_[0], g2 = allpass_[1];
     long done = 0;
     while (done < frames) {
-        // Blocks end where the first line wraps, so the loop below never tests for it.
-        long block = frames - done;
+        // Blocks end where the first line wraps, so the loops below never test for it, and
+        // hold no more frames than the shortest line: no cell a block reads was written in
+        // the same block, so each step can run over the whole block before the next.
+        long block = std::min<long>(frames - done, kChunk);
         for (int l = 0; l < kLines; ++l) block = std::min<long>(block, length_[l] - cursor_[l]);
+        block = std::min<long>(block, *std::min_element(length_.begin(), length_.end()));
         std::array<float*, kLines> p{};
         for (int l = 0; l < kLines; ++l) p[l] = base[l] + cursor_[l];
+        const float* x_in = in + done;
+        float x[kChunk], sum[kChunk], d[4][kChunk], y[4][kChunk];
+        for (long i = 0; i < block; ++i) x[i] = flush(x_in[i]);
+        for (int c = 0; c < 4; ++c)
+            for (long i = 0; i < block; ++i) d[c][i] = flush(p[c][i]);
+        for (long i = 0; i < block; ++i) sum[i] = (((0.0f + d[0][i]) + d[1][i]) + d[2][i]) + d[3][i];
+        // The low passes are the only recursion: four chains side by side.
+        for (long i = 0; i < block; ++i)
+            for (int c = 0; c < 4; ++c) y[c][i] = lowpass_[c].step(d[c][i], k[c]);
+        for (int c = 0; c < 4; ++c)
+            for (long i = 0; i < block; ++i) p[c][i] = y[c][i] * feedback_[c] + x[i];
+        float* o = out + 2 * done;
         for (long i = 0; i < block; ++i) {
-            const float x = flush(in[done + i]);
-            float sum = 0;
-            for (int c = 0; c < 4; ++c) {
-                float& cell = p[c][i];
-                const float d = flush(cell);
-                const float y = lowpass_[c].step(d, k[c]);
-                cell = y * feedback_[c] + x;
-                sum += d;
-            }
             float& a1 = p[4][i];
             const float z1 = flush(a1);
-            const float w1 = flush(sum + g1 * z1);
+            const float w1 = flush(sum[i] + g1 * z1);
             const float out1 = z1 - g1 * w1;
             a1 = w1;
             float& a2 = p[5][i];
@@ -80,10 +86,10 @@ void Reverb::compute(const float* in, float* out, long frames, float gain_left, 
             const float out2 = z2 - g2 * w2;
             a2 = w2;
             float& delay = p[6][i];
-            const float y = flush(delay);
+            const float yd = flush(delay);
             delay = out2 * output_gain_;
-            out[2 * (done + i)] += y * gain_left;
-            out[2 * (done + i) + 1] -= y * gain_right;
+            o[2 * i] += yd * gain_left;
+            o[2 * i + 1] -= yd * gain_right;
         }
         done += block;
         for (int l = 0; l < kLines; ++l) {

@@ -30,6 +30,7 @@ public:
     float cutoff(int comb) const { return cutoff_[comb]; }
 
 private:
+    static constexpr long kChunk = 64;  // frames a block step works on at most
     std::array<OnePole, 4> lowpass_{};
     std::array<float, 4> cutoff_ = {1000, 2000, 2000, 1500};
     std::array<float, 4> feedback_ = {0.918f, 0.5f, 0.573f, 0.552f};

@@ -37,29 +37,39 @@ void ReverbDHS::compute(const float* in, float* out, long frames, float gain_lef
     if (delay_cursor_ >= delay_length_) delay_cursor_ = 0;
     long done = 0;
     while (done < frames) {
-        long block = frames - done;
+        // As in the other reverberator: blocks end at the first wrap and hold no more
+        // frames than the shortest line, so each step runs over a whole block.
+        long block = std::min<long>(frames - done, kChunk);
         for (int c = 0; c < kCombs; ++c) block = std::min<long>(block, length_[c] - cursor_[c]);
+        for (int c = 0; c < kCombs; ++c) block = std::min<long>(block, length_[c]);
         if (delayed) block = std::min<long>(block, delay_length_ - delay_cursor_);
         std::array<float*, kCombs> p{};
         for (int c = 0; c < kCombs; ++c) p[c] = combs_.get() + c * kCombFloats + cursor_[c];
         float* dp = delay_.get() + delay_cursor_;
+        float x[kChunk], s[kChunk], u[kCombs][kChunk];
         for (long i = 0; i < block; ++i) {
-            const float x = flush(0.4f * in[done + i]);
-            float s = 0;
-            for (int c = 0; c < kCombs; ++c) {
-                float& cell = p[c][i];
-                const float d = flush(cell);
-                cell = lowpass_[c].step(x - feedback_[c] * d, k[c]);
-                s += tap_[c] * d;
+            x[i] = flush(0.4f * in[done + i]);
+            s[i] = 0.0f;
+        }
+        for (int c = 0; c < kCombs; ++c)
+            for (long i = 0; i < block; ++i) {
+                const float d = flush(p[c][i]);
+                u[c][i] = x[i] - feedback_[c] * d;
+                s[i] += tap_[c] * d;
             }
-            s = flush(s);
+        // The low passes are the only recursion: five chains side by side.
+        for (long i = 0; i < block; ++i)
+            for (int c = 0; c < kCombs; ++c) p[c][i] = lowpass_[c].step(u[c][i], k[c]);
+        float* o = out + 2 * done;
+        for (long i = 0; i < block; ++i) {
+            float v = flush(s[i]);
             if (delayed) {
                 const float y = flush(dp[i]);
-                dp[i] = s * delay_gain_;
-                s = y;
+                dp[i] = v * delay_gain_;
+                v = y;
             }
-            out[2 * (done + i)] += s * gain_left;
-            out[2 * (done + i) + 1] -= s * gain_right;
+            o[2 * i] += v * gain_left;
+            o[2 * i + 1] -= v * gain_right;
         }
         done += block;
         for (int c = 0; c < kCombs; ++c) {

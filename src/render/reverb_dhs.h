@@ -29,6 +29,7 @@ public:
     uint16_t delay_length() const { return delay_length_; }
 
 private:
+    static constexpr long kChunk = 64;  // frames a block step works on at most
     std::array<OnePole, 10> lowpass_{};
     std::array<float, 10> cutoff_ = {2000, 2000, 2000, 2000, 2000, 2000, 2000, 2000, 2000, 2000};
     std::array<float, kCombs> feedback_ = {0.818f, 0.5f, 0.573f, 0.552f, 0.699f};
