@@ -69,8 +69,10 @@ void Reverb::compute(const float* in, float* out, long frames, float gain_left, 
             for (long i = 0; i < block; ++i) d[c][i] = flush(p[c][i]);
         for (long i = 0; i < block; ++i) sum[i] = (((0.0f + d[0][i]) + d[1][i]) + d[2][i]) + d[3][i];
         // The low passes are the only recursion: four chains side by side.
+        std::array<OnePole, 4> lp = lowpass_;
         for (long i = 0; i < block; ++i)
-            for (int c = 0; c < 4; ++c) y[c][i] = lowpass_[c].step(d[c][i], k[c]);
+            for (int c = 0; c < 4; ++c) y[c][i] = lp[c].step(d[c][i], k[c]);
+        lowpass_ = lp;
         for (int c = 0; c < 4; ++c)
             for (long i = 0; i < block; ++i) p[c][i] = y[c][i] * feedback_[c] + x[i];
         float* o = out + 2 * done;
