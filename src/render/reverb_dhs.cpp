@@ -70,9 +70,9 @@ void ReverbDHS::compute(const float* in, float* out, long frames, float gain_lef
         for (long i = 0; i < block; ++i) {
             float v = flush(s[i]);
             if (delayed) {
-                const float y = flush(dp[i]);
+                const float delayed_v = flush(dp[i]);
                 dp[i] = v * delay_gain_;
-                v = y;
+                v = delayed_v;
             }
             o[2 * i] += v * gain_left;
             o[2 * i + 1] -= v * gain_right;
