@@ -56,7 +56,8 @@ std::vector<Run> medians_of(int runs, const std::vector<RenderOnce>& players) {
         for (size_t p = 0; p < players.size(); ++p) all[p].push_back(repeated(players[p]));
     std::vector<Run> medians;
     for (auto& runs_of_one : all) {
-        std::sort(runs_of_one.begin(), runs_of_one.end(), [](const Run& a, const Run& b) { return a.x() < b.x(); });
+        std::sort(runs_of_one.begin(), runs_of_one.end(),
+                  [](const Run& a, const Run& b) { return a.x() < b.x(); });
         medians.push_back(runs_of_one[runs_of_one.size() / 2]);
     }
     return medians;
@@ -93,8 +94,8 @@ private:
 class Openmpt {
 public:
     explicit Openmpt(const std::vector<char>& data)
-        : mod_(openmpt_module_create_from_memory2(data.data(), data.size(), nullptr, nullptr, nullptr, nullptr,
-                                                  nullptr, nullptr, nullptr)) {
+        : mod_(openmpt_module_create_from_memory2(data.data(), data.size(), nullptr, nullptr, nullptr,
+                                                  nullptr, nullptr, nullptr, nullptr)) {
         if (mod_) openmpt_module_set_render_param(mod_, OPENMPT_MODULE_RENDER_INTERPOLATIONFILTER_LENGTH, 2);
     }
     ~Openmpt() {
@@ -107,7 +108,8 @@ public:
         uint64_t frames = 0;
         const auto start = Clock::now();
         while (frames < kMaxSeconds * kRate) {
-            const size_t n = openmpt_module_read_interleaved_float_stereo(mod_, kRate, kFrames, buffer_.data());
+            const size_t n =
+                openmpt_module_read_interleaved_float_stereo(mod_, kRate, kFrames, buffer_.data());
             if (n == 0) break;
             frames += n;
         }
@@ -159,8 +161,10 @@ int main(int argc, char** argv) {
     std::string corpus = "../shared/corpus";
     int runs = 5;
     for (int i = 1; i < argc; ++i) {
-        if (!std::strcmp(argv[i], "--runs") && i + 1 < argc) runs = std::max(1, std::atoi(argv[++i]));
-        else if (!std::strcmp(argv[i], "--corpus") && i + 1 < argc) corpus = argv[++i];
+        if (!std::strcmp(argv[i], "--runs") && i + 1 < argc)
+            runs = std::max(1, std::atoi(argv[++i]));
+        else if (!std::strcmp(argv[i], "--corpus") && i + 1 < argc)
+            corpus = argv[++i];
         else {
             std::fprintf(stderr, "usage: bench_peers [--runs N] [--corpus DIR]\n");
             return 2;
@@ -177,8 +181,8 @@ int main(int argc, char** argv) {
         std::fprintf(stderr, "bench_peers: no modules under %s\n", corpus.c_str());
         return 1;
     }
-    std::printf("%-36s %8s %9s %9s %9s %8s %8s\n", "module", "song s", "ours x", "openmpt x", "xmp x", "/openmpt",
-                "/xmp");
+    std::printf("%-36s %8s %9s %9s %9s %8s %8s\n", "module", "song s", "ours x", "openmpt x", "xmp x",
+                "/openmpt", "/xmp");
     double worst = 1e9;
     for (const auto& path : files) {
         std::ifstream in(path, std::ios::binary);
@@ -191,14 +195,15 @@ int main(int argc, char** argv) {
         openmpt.render();
         xmp.render();
         const std::vector<Run> m = medians_of(
-            runs, {[&] { return ours.render(); }, [&] { return openmpt.render(); }, [&] { return xmp.render(); }});
+            runs,
+            {[&] { return ours.render(); }, [&] { return openmpt.render(); }, [&] { return xmp.render(); }});
         const Run &a = m[0], &b = m[1], &c = m[2];
         const double vs_openmpt = b.x() > 0 ? a.x() / b.x() : 0;
         const double vs_xmp = c.x() > 0 ? a.x() / c.x() : 0;
         const double fastest_peer = std::max(b.x(), c.x());
         if (fastest_peer > 0) worst = std::min(worst, a.x() / fastest_peer);
-        std::printf("%-36s %8.1f %9.0f %9.0f %9.0f %8.2f %8.2f\n", path.filename().string().c_str(), song_seconds,
-                    a.x(), b.x(), c.x(), vs_openmpt, vs_xmp);
+        std::printf("%-36s %8.1f %9.0f %9.0f %9.0f %8.2f %8.2f\n", path.filename().string().c_str(),
+                    song_seconds, a.x(), b.x(), c.x(), vs_openmpt, vs_xmp);
     }
     std::printf("\nslowest ratio of ours to the faster peer: %.2f\n", worst);
     return 0;

@@ -248,7 +248,8 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     const StereoMixFn mix_stereo = stereo ? stereo_mixer(bits16, out_mode) : nullptr;
     const MonoMixFn mix_alone =
         stereo ? nullptr : mono_mixer(bits16, interpolate, send ? SendMode::First : SendMode::None, out_mode);
-    const MonoMixFn mix_adding = send && !stereo ? mono_mixer(bits16, interpolate, SendMode::Add, out_mode) : nullptr;
+    const MonoMixFn mix_adding =
+        send && !stereo ? mono_mixer(bits16, interpolate, SendMode::Add, out_mode) : nullptr;
 
     int64_t pos = v.position;
     double f = v.fraction;

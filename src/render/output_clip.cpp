@@ -55,9 +55,10 @@ __attribute__((target("avx2"))) Peaks clip_avx2(float* out, int frames) {
 
 // Clips sixteen values (eight frames) in place, only those in mask; returns their magnitudes.
 __attribute__((target("avx512f"))) inline __m512 clip16(float* o, __mmask16 mask) {
-    const __m512 v = _mm512_min_ps(
-        _mm512_max_ps(_mm512_mul_ps(_mm512_maskz_loadu_ps(mask, o), _mm512_set1_ps(0.25f)), _mm512_set1_ps(-1.0f)),
-        _mm512_set1_ps(1.0f));
+    const __m512 v =
+        _mm512_min_ps(_mm512_max_ps(_mm512_mul_ps(_mm512_maskz_loadu_ps(mask, o), _mm512_set1_ps(0.25f)),
+                                    _mm512_set1_ps(-1.0f)),
+                      _mm512_set1_ps(1.0f));
     _mm512_mask_storeu_ps(o, mask, v);
     return _mm512_abs_ps(v);
 }

@@ -58,7 +58,8 @@ bool has_avx2() {
 }
 
 bool has_avx512() {
-    static const bool yes = has_avx2() && __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512vl");
+    static const bool yes =
+        has_avx2() && __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512vl");
     return yes;
 }
 
@@ -66,11 +67,14 @@ template <typename S, OutMode Out>
 MonoMixFn pick_mono(bool interpolate, SendMode send) {
     switch (send) {
         case SendMode::None:
-            return interpolate ? mix_mono<S, true, SendMode::None, Out> : mix_mono<S, false, SendMode::None, Out>;
+            return interpolate ? mix_mono<S, true, SendMode::None, Out>
+                               : mix_mono<S, false, SendMode::None, Out>;
         case SendMode::First:
-            return interpolate ? mix_mono<S, true, SendMode::First, Out> : mix_mono<S, false, SendMode::First, Out>;
+            return interpolate ? mix_mono<S, true, SendMode::First, Out>
+                               : mix_mono<S, false, SendMode::First, Out>;
         case SendMode::Add:
-            return interpolate ? mix_mono<S, true, SendMode::Add, Out> : mix_mono<S, false, SendMode::Add, Out>;
+            return interpolate ? mix_mono<S, true, SendMode::Add, Out>
+                               : mix_mono<S, false, SendMode::Add, Out>;
     }
     return nullptr;
 }

@@ -1,13 +1,13 @@
 // The output stage's headroom, clip and peak meters over lengths that reach every part of
 // the vector loops (whole blocks, single vectors, the masked or scalar rest).
+#include "render/output_clip.h"
+
 #include <gtest/gtest.h>
 
 #include <algorithm>
 #include <cmath>
 #include <random>
 #include <vector>
-
-#include "render/output_clip.h"
 
 namespace ondrel {
 namespace {

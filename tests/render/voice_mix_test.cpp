@@ -1,5 +1,7 @@
 // Every set of mix loops the CPU runs (each sample width, interpolation, send and output
 // mode) against a plain reference, over steps on both sides of the vector regimes.
+#include "render/voice_mix.h"
+
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -7,7 +9,6 @@
 #include <random>
 #include <vector>
 
-#include "render/voice_mix.h"
 #include "song/sample.h"
 
 namespace ondrel {
@@ -59,8 +60,9 @@ struct Case {
 template <typename S>
 void check_mono(const Case& c, double f, double step, int count) {
     SCOPED_TRACE(testing::Message() << "bits16 " << c.bits16 << " interpolate " << c.interpolate << " send "
-                                    << static_cast<int>(c.send) << " set " << (c.out == OutMode::Set) << " loops " << static_cast<int>(c.set) << " f " << f
-                                    << " step " << step << " count " << count);
+                                    << static_cast<int>(c.send) << " set " << (c.out == OutMode::Set)
+                                    << " loops " << static_cast<int>(c.set) << " f " << f << " step " << step
+                                    << " count " << count);
     const int frames = static_cast<int>(std::floor(f + (count - 1) * step)) + 1;
     const Data d = random_data<S>(frames, 1, static_cast<uint32_t>(count * 7919 + frames));
     std::vector<float> out(2 * count + 2), send(count + 1);
