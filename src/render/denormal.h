@@ -22,11 +22,20 @@ struct OnePoleCoefficients {
     }
 };
 
+// The low pass in two parts: what the inputs give, which needs no earlier output, and the
+// recursion on the output. Blocks can compute the first part for many frames at once.
+inline float one_pole_drive(float u, float u1, const OnePoleCoefficients& c) {
+    return c.gain * (u + u1);
+}
+inline float one_pole_output(float y1, float drive, const OnePoleCoefficients& c) {
+    return flush(c.feedback * y1 + drive);
+}
+
 struct OnePole {
     float y1 = 0;
     float u1 = 0;
     float step(float u, const OnePoleCoefficients& c) {
-        const float y = flush(c.feedback * y1 + c.gain * (u + u1));
+        const float y = one_pole_output(y1, one_pole_drive(u, u1, c), c);
         y1 = y;
         u1 = u;
         return y;

@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <new>
 
+#include "render/low_pass_bank.h"
+
 namespace ondrel {
 
 uint16_t reverb_frames(uint32_t microseconds, uint32_t limit) {
@@ -68,11 +70,10 @@ void Reverb::compute(const float* in, float* out, long frames, float gain_left, 
         for (int c = 0; c < 4; ++c)
             for (long i = 0; i < block; ++i) d[c][i] = flush(p[c][i]);
         for (long i = 0; i < block; ++i) sum[i] = (((0.0f + d[0][i]) + d[1][i]) + d[2][i]) + d[3][i];
-        // The low passes are the only recursion: four chains side by side.
-        std::array<OnePole, 4> lp = lowpass_;
-        for (long i = 0; i < block; ++i)
-            for (int c = 0; c < 4; ++c) y[c][i] = lp[c].step(d[c][i], k[c]);
-        lowpass_ = lp;
+        // The low passes: their inputs' part over the block, then the recursions, the
+        // only serial work, four chains side by side.
+        float* const ys[4] = {y[0], y[1], y[2], y[3]};
+        low_passes(lowpass_.data(), k.data(), d, ys, block);
         for (int c = 0; c < 4; ++c)
             for (long i = 0; i < block; ++i) p[c][i] = y[c][i] * feedback_[c] + x[i];
         float* o = out + 2 * done;

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <new>
 
+#include "render/low_pass_bank.h"
 #include "render/reverb.h"
 
 namespace ondrel {
@@ -57,15 +58,8 @@ void ReverbDHS::compute(const float* in, float* out, long frames, float gain_lef
                 u[c][i] = x[i] - feedback_[c] * d;
                 s[i] += tap_[c] * d;
             }
-        // The low passes are the only recursion: five chains side by side, their states
-        // held locally so that the line writes cannot be taken to touch them.
-        std::array<OnePole, kCombs> lp;
-        std::copy_n(lowpass_.begin(), kCombs, lp.begin());
-        float y[kCombs][kChunk];
-        for (long i = 0; i < block; ++i)
-            for (int c = 0; c < kCombs; ++c) y[c][i] = lp[c].step(u[c][i], k[c]);
-        std::copy_n(lp.begin(), kCombs, lowpass_.begin());
-        for (int c = 0; c < kCombs; ++c) std::copy_n(y[c], block, p[c]);
+        // The low passes, the only serial work, write the lines.
+        low_passes(lowpass_.data(), k.data(), u, p.data(), block);
         float* o = out + 2 * done;
         for (long i = 0; i < block; ++i) {
             float v = flush(s[i]);
