@@ -14,19 +14,25 @@ void ActiveFilter::run(const float* send, float* out, int frames, int control, u
     const float beta = (3 - theta) / (6 + 2 * theta);
     const float gamma = (beta + 0.5f) * std::cos(theta);
     const float alpha = 0.25f - beta * 0.5f;
+    // The history in locals, as out could otherwise be taken to alias it.
+    float x1 = entrem1, x2 = entrem2, y1 = sortiem1, y2 = sortiem2;
     for (int i = 0; i < frames; ++i) {
         const float s = send[i];
-        float y = gamma * sortiem1 + alpha * (s - entrem2) - beta * sortiem2;
+        float y = gamma * y1 + alpha * (s - x2) - beta * y2;
         if (std::fabs(y) < 0.0001f) y = 0;
         y *= 2 * g;
         // The history keeps the gain, so the gain shapes the resonance too.
-        sortiem2 = sortiem1;
-        sortiem1 = y;
-        entrem2 = entrem1;
-        entrem1 = s;
+        y2 = y1;
+        y1 = y;
+        x2 = x1;
+        x1 = s;
         out[2 * i] += 4 * y * gain_left;
         out[2 * i + 1] += 4 * y * gain_right;
     }
+    entrem1 = x1;
+    entrem2 = x2;
+    sortiem1 = y1;
+    sortiem2 = y2;
 }
 
 }  // namespace ondrel

@@ -34,22 +34,32 @@ void Iir2Filter::run(int type, int slot, const float* send, float* out, int fram
     const float a0 = static_cast<float>(q / d);
     const float b1 = static_cast<float>((a - q) / d);
     const float b2 = static_cast<float>((a + q - 2 * w) / d);
+    // The two-entry rings in locals (entry r and the other one), as out could otherwise be
+    // taken to alias them; they go back to the rings after the loop.
     int r = lesind[slot] & 1;
+    float xr = x[r], xo = x[r ^ 1], yr = y[r], yo = y[r ^ 1];
     for (int i = 0; i < frames; ++i) {
         const float s = send[i];
-        x[r] = s;
-        const float x1 = x[r ^ 1];
-        const float y1 = y[r];
-        const float y2 = y[r ^ 1];
+        xr = s;
+        const float x1 = xo;
+        const float y1 = yr;
+        const float y2 = yo;
         // Only two history entries: the feed-forward part is 2 a0 (x + x1), computed in
         // this order.
         const float v = flush(a0 * x1 + 2 * a0 * s + 2 * b1 * y1 + (a0 * x1 - b2 * y2));
-        y[r ^ 1] = v;
-        r ^= 1;
+        yo = v;
+        // r ^= 1: the entries swap roles.
+        std::swap(xr, xo);
+        std::swap(yr, yo);
         const float o = high ? s - v : v;
         out[2 * i] += o * gain_left;
         out[2 * i + 1] += o * gain_right;
+        r ^= 1;
     }
+    x[r] = xr;
+    x[r ^ 1] = xo;
+    y[r] = yr;
+    y[r ^ 1] = yo;
     lesind[slot] = static_cast<int16_t>(r);
 }
 
