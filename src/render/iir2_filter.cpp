@@ -46,7 +46,7 @@ void Iir2Filter::run(int type, int slot, const float* send, float* out, int fram
         const float y2 = yo;
         // Only two history entries: the feed-forward part is 2 a0 (x + x1), computed in
         // this order.
-        const float v = flush(a0 * x1 + 2 * a0 * s + 2 * b1 * y1 + (a0 * x1 - b2 * y2));
+        const float v = flush_branching(a0 * x1 + 2 * a0 * s + 2 * b1 * y1 + (a0 * x1 - b2 * y2));
         yo = v;
         // r ^= 1: the entries swap roles.
         std::swap(xr, xo);
