@@ -19,7 +19,7 @@ void ActiveFilter::run(const float* send, float* out, int frames, int control, u
     for (int i = 0; i < frames; ++i) {
         const float s = send[i];
         float y = gamma * y1 + alpha * (s - x2) - beta * y2;
-        if (std::fabs(y) < 0.0001f) y = 0;
+        if (y > -0.0001f && y < 0.0001f) y = 0;  // a branch: predicted, it adds nothing to the chain
         y *= 2 * g;
         // The history keeps the gain, so the gain shapes the resonance too.
         y2 = y1;
