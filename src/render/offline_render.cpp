@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <memory>
 #include <span>
 #include <vector>
 
@@ -10,12 +11,13 @@ namespace ondrel {
 RenderEnd render_offline(Mixer& mixer, Player& player, const OfflineOptions& options,
                          const RenderSink& sink) {
     const int frames = std::clamp(options.buffer_frames, 16, kMaxFramesPerCall);
-    // Cache-line aligned, so the mixer's vector loads and stores never straddle two lines.
-    struct alignas(64) Frame16 {
-        float v[32];
-    };
-    std::vector<Frame16> blocks((2 * static_cast<size_t>(frames) + 31) / 32);
-    const std::span<float> buffer(blocks.front().v, 2 * static_cast<size_t>(frames));
+    // Aligned to a cache line, so the output stage's vector passes never straddle two.
+    constexpr size_t kLineFloats = 64 / sizeof(float);
+    std::vector<float> storage(2 * static_cast<size_t>(frames) + kLineFloats);
+    void* start = storage.data();
+    size_t room = storage.size() * sizeof(float);
+    std::align(64, 2 * static_cast<size_t>(frames) * sizeof(float), start, room);
+    const std::span<float> buffer(static_cast<float*>(start), 2 * static_cast<size_t>(frames));
     const AudioFormat format{static_cast<float>(kOutputRate), 2, kFormatFloat};
     const uint64_t limit = options.max_seconds > 0
                                ? static_cast<uint64_t>(std::llround(options.max_seconds * kOutputRate))
