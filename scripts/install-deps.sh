@@ -3,20 +3,32 @@
 # are already there are left alone, so running it again costs a second.
 set -euo pipefail
 
-packages=(
+# Two groups, installed in this order: the JACK server's development files must be in
+# place before the MIDI library, or apt replaces one with the other.
+packages_first=(
   build-essential cmake pkg-config python3
-  libgtest-dev zlib1g-dev
-  libsdl2-dev libmagic-dev
+  libgtest-dev libbenchmark-dev zlib1g-dev libpng-dev
+  libsdl2-dev libmagic-dev libimgui-dev
   clang libclang-rt-dev
+  jackd2 libjack-jackd2-dev
+  xvfb xauth xdotool imagemagick desktop-file-utils libxml2-utils shared-mime-info
+)
+packages_second=(
+  librtmidi-dev libfluidsynth-dev timgm6mb-soundfont
 )
 
-missing=()
-for p in "${packages[@]}"; do
-  if ! dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed"; then
-    missing+=("$p")
-  fi
-done
-[ ${#missing[@]} -eq 0 ] && exit 0
+missing_of() {
+  local p
+  for p in "$@"; do
+    if ! dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed"; then
+      printf '%s\n' "$p"
+    fi
+  done
+}
+mapfile -t first < <(missing_of "${packages_first[@]}")
+mapfile -t second < <(missing_of "${packages_second[@]}")
+[ ${#first[@]} -eq 0 ] && [ ${#second[@]} -eq 0 ] && exit 0
+missing=("${first[@]}" "${second[@]}")
 
 sudo=""
 if [ "$(id -u)" -ne 0 ]; then
@@ -28,4 +40,5 @@ fi
 echo "install-deps: installing ${missing[*]}"
 export DEBIAN_FRONTEND=noninteractive
 $sudo apt-get update -qq
-$sudo apt-get install -y -qq --no-install-recommends "${missing[@]}"
+[ ${#first[@]} -eq 0 ] || $sudo apt-get install -y -qq --no-install-recommends "${first[@]}"
+[ ${#second[@]} -eq 0 ] || $sudo apt-get install -y -qq --no-install-recommends "${second[@]}"
