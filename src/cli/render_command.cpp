@@ -17,7 +17,8 @@ void render_usage(std::ostream& out) {
     out << "usage: ondrel render FILE -o OUT.wav [options]\n"
            "Renders the song offline, faster than real time, to a 44100 Hz stereo WAV file.\n"
            "It stops at the song's end, when the song comes back to a row it has already\n"
-           "played, or at --max-seconds. OUT is replaced only once it is complete.\n\n"
+           "played, or at --max-seconds. A file OUT is replaced only once it is complete;\n"
+           "a pipe or a device (or '-', standard output) gets the sound as it is rendered.\n\n"
            "  -o OUT.wav           the file to write\n"
            "  --float              32-bit float samples instead of 16-bit\n"
            "  --quiet              no progress bar\n"
@@ -91,8 +92,9 @@ int cmd_render(const Args& args) {
                            return true;
                        });
     if (progress) std::fprintf(stderr, "\r%70s\r", "");
+    if (end == RenderEnd::Aborted) why = wav.error();
     if (end == RenderEnd::Aborted || !wav.finish(why)) {
-        std::cerr << "ondrel: " << (why.empty() ? "cannot write " + out : why) << "\n";
+        std::cerr << "ondrel: " << why << "\n";
         wav.abandon();
         return kExitFailed;
     }
@@ -100,7 +102,8 @@ int cmd_render(const Args& args) {
     const double took = std::chrono::duration<double>(std::chrono::steady_clock::now() - started).count();
     if (!quiet)
         std::fprintf(stderr, "wrote %s: %.1f s of sound in %.2f s (%.0fx real time); stopped at the %s\n",
-                     out.c_str(), seconds, took, took > 0 ? seconds / took : 0.0, render_end_text(end));
+                     out == "-" ? "standard output" : out.c_str(), seconds, took,
+                     took > 0 ? seconds / took : 0.0, render_end_text(end));
     return kExitOk;
 }
 

@@ -1,7 +1,7 @@
 #include "export/otm_writer.h"
 
-#include "export/atomic_file.h"
 #include "export/byte_writer.h"
+#include "export/output_file.h"
 
 namespace ondrel {
 
@@ -168,8 +168,8 @@ bool save_otm(const std::string& path, SongBank& bank, int song, const EffectSlo
         why = "no such song";
         return false;
     }
-    if (!write_file_atomically(path, write_otm(bank, song, slots), why)) return false;
-    set_text(bank.timod[song]->path, path.c_str());
+    if (!write_output_file(path, write_otm(bank, song, slots), why)) return false;
+    if (path != "-") set_text(bank.timod[song]->path, path.c_str());
     return true;
 }
 

@@ -12,7 +12,8 @@ namespace ondrel {
 // then "efx.".
 std::vector<uint8_t> write_otm(const SongBank& bank, int song, const EffectSlots& slots);
 
-// Saves the song to path (atomically) and records path in the song; false with why set.
+// Saves the song to path (by the rules of OutputFile) and records path in the song; false
+// with why set.
 bool save_otm(const std::string& path, SongBank& bank, int song, const EffectSlots& slots, std::string& why);
 
 }  // namespace ondrel

@@ -16,6 +16,13 @@ int wav_sample_bytes(WavSampleFormat format) {
     return 2;
 }
 
+namespace {
+// Size fields of a header that cannot be rewritten: unknown, read to the end of the stream.
+constexpr uint32_t kUnknownSize = 0xFFFFFFFF;
+// Largest data chunk a RIFF size field can describe, with the header and a pad byte.
+constexpr uint64_t kMaxDataBytes = 0xFFFFFFF0ull;
+}  // namespace
+
 bool WavWriter::open(const std::string& path, int channels, int rate, WavSampleFormat format,
                      std::string& why) {
     if (!file_.open(path, why)) return false;
@@ -23,14 +30,13 @@ bool WavWriter::open(const std::string& path, int channels, int rate, WavSampleF
     rate_ = rate;
     format_ = format;
     frames_ = 0;
-    failed_ = false;
-    return write_header(0);
-}
-
-bool WavWriter::put(const void* data, size_t bytes) {
-    if (failed_ || !file_.stream()) return false;
-    if (std::fwrite(data, 1, bytes, file_.stream()) != bytes) failed_ = true;
-    return !failed_;
+    const auto h = file_.seekable() ? header(0, 0) : header(kUnknownSize, kUnknownSize);
+    if (!file_.write(h.data(), h.size())) {
+        why = file_.error();
+        file_.abandon();
+        return false;
+    }
+    return true;
 }
 
 namespace {
@@ -47,13 +53,14 @@ void tag(std::vector<uint8_t>& b, const char* t) {
 }
 }  // namespace
 
-bool WavWriter::write_header(uint32_t data_bytes) {
+std::vector<uint8_t> WavWriter::header(uint32_t data_bytes, uint32_t frames) const {
     const bool is_float = format_ == WavSampleFormat::Float32;
     const uint32_t bytes = static_cast<uint32_t>(wav_sample_bytes(format_));
     const uint32_t fmt_size = is_float ? 18 : 16;
     std::vector<uint8_t> h;
     tag(h, "RIFF");
-    le32(h, 4 + (8 + fmt_size) + (is_float ? 12 : 0) + 8 + data_bytes + (data_bytes & 1));
+    const uint32_t head = 4 + (8 + fmt_size) + (is_float ? 12 : 0) + 8;
+    le32(h, data_bytes == kUnknownSize ? kUnknownSize : head + data_bytes + (data_bytes & 1));
     tag(h, "WAVE");
     tag(h, "fmt ");
     le32(h, fmt_size);
@@ -67,11 +74,11 @@ bool WavWriter::write_header(uint32_t data_bytes) {
         le16(h, 0);
         tag(h, "fact");
         le32(h, 4);
-        le32(h, static_cast<uint32_t>(frames_));
+        le32(h, frames);
     }
     tag(h, "data");
     le32(h, data_bytes);
-    return put(h.data(), h.size());
+    return h;
 }
 
 bool WavWriter::write(const float* samples, size_t frames) {
@@ -96,7 +103,7 @@ bool WavWriter::write(const float* samples, size_t frames) {
                 case WavSampleFormat::Float32: std::memcpy(buffer + 4 * i, &x, 4); break;
             }
         }
-        if (!put(buffer, chunk * per)) return false;
+        if (!file_.write(buffer, chunk * per)) return false;
         done += chunk;
     }
     frames_ += frames;
@@ -104,21 +111,24 @@ bool WavWriter::write(const float* samples, size_t frames) {
 }
 
 bool WavWriter::finish(std::string& why) {
-    if (!file_.stream()) {
-        why = "nothing to finish";
+    if (!file_.is_open()) {
+        why = file_.error().empty() ? "nothing to finish" : file_.error();
         return false;
     }
     const uint64_t data_bytes = frames_ * static_cast<uint64_t>(channels_) * wav_sample_bytes(format_);
-    if (data_bytes > 0xFFFFFFF0ull) {
+    if (file_.seekable() && data_bytes > kMaxDataBytes) {
         why = "the sound is too long for a WAV file";
         abandon();
         return false;
     }
-    if (data_bytes & 1) put("", 1);
-    if (!failed_ && std::fseek(file_.stream(), 0, SEEK_SET) == 0)
-        write_header(static_cast<uint32_t>(data_bytes));
-    if (failed_) {
-        why = "cannot write the sound file";
+    const uint8_t pad = 0;
+    bool ok = !(data_bytes & 1) || file_.write(&pad, 1);
+    if (ok && file_.seekable()) {
+        const auto h = header(static_cast<uint32_t>(data_bytes), static_cast<uint32_t>(frames_));
+        ok = file_.rewrite(0, h.data(), h.size());
+    }
+    if (!ok) {
+        why = file_.error();
         abandon();
         return false;
     }

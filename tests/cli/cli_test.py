@@ -2,6 +2,7 @@
 """The ondrel command line end to end: exit codes, messages and the JSON report."""
 import json
 import os
+import stat
 import subprocess
 import sys
 import tempfile
@@ -131,6 +132,38 @@ with tempfile.TemporaryDirectory() as tmp:
     missing_dir = os.path.join(tmp, "no", "such", "dir", "x.wav")
     r = run("render", DEMO, "-o", missing_dir)
     check("render to a missing folder", r.returncode == 1 and r.stderr.startswith("ondrel: "), r.stderr)
+
+    # Where the sound goes: standard output (a pipe, or a file it was redirected to), devices.
+    def render_to(stdout, *extra):
+        return subprocess.run([ONDREL, "render", DEMO, "-o", "-", "--max-seconds", "1", "--quiet", *extra],
+                              stdout=stdout, stderr=subprocess.PIPE, timeout=60)
+
+    r = render_to(subprocess.PIPE)
+    unknown = b"\xff" * 4
+    check("render to a pipe", r.returncode == 0 and r.stdout[:4] == b"RIFF" and r.stdout[4:8] == unknown
+          and r.stdout[40:44] == unknown and len(r.stdout) == 44 + 44100 * 4, (r.returncode, r.stdout[:44]))
+    redirected = os.path.join(tmp, "redirected.wav")
+    with open(redirected, "wb") as f:
+        f.write(b"abc")
+        f.flush()
+        render_to(f)
+    with open(redirected, "rb") as f:
+        data = f.read()
+    check("standard output redirected to a file gets the real sizes",
+          data[:3] == b"abc" and int.from_bytes(data[43:47], "little") == 44100 * 4, data[:47])
+    p = subprocess.Popen([ONDREL, "render", DEMO, "-o", "-", "--quiet"], stdout=subprocess.PIPE,
+                         stderr=subprocess.PIPE)
+    p.stdout.read(100)
+    p.stdout.close()
+    err = p.stderr.read().decode()
+    check("a reader that leaves", p.wait(timeout=60) == 1
+          and err == "ondrel: cannot write standard output: Broken pipe\n", (p.returncode, err))
+    for device, ok in (("/dev/null", True), ("/dev/full", False)):
+        if os.path.exists(device):
+            r = run("render", DEMO, "-o", device, "--max-seconds", "1", "--quiet")
+            want = "" if ok else f"ondrel: cannot write {device}: No space left on device\n"
+            check(f"render to {device}", r.returncode == (0 if ok else 1) and r.stderr == want
+                  and stat.S_ISCHR(os.stat(device).st_mode), (r.returncode, r.stderr))
 
     # Live play through SDL's dummy and disk drivers (no sound card needed).
     env = dict(os.environ, SDL_AUDIODRIVER="dummy")
