@@ -1,7 +1,9 @@
 #include <cstring>
+#include <filesystem>
 #include <iostream>
 
 #include "cli/commands.h"
+#include "shell/gui/desktop_program.h"
 
 namespace {
 
@@ -26,7 +28,8 @@ const Command kCommands[] = {
 void usage(std::ostream& out) {
     out << "Ondrel Tracker " ONDREL_VERSION
            "\n\n"
-           "usage: ondrel COMMAND [OPTIONS] FILE\n\n"
+           "usage: ondrel [FILE...]            the desktop program, opening the files given\n"
+           "       ondrel COMMAND [OPTIONS] FILE\n\n"
            "commands:\n";
     for (const auto& c : kCommands) out << "  " << c.summary << "\n";
     out << "\n'ondrel COMMAND --help' tells more about one command.\n"
@@ -37,11 +40,7 @@ void usage(std::ostream& out) {
 }  // namespace
 
 int main(int argc, char** argv) {
-    if (argc < 2) {
-        usage(std::cerr);
-        std::cerr << "\nThe desktop window is not part of this build yet; use a command above.\n";
-        return ondrel::kExitUsage;
-    }
+    if (argc < 2) return ondrel::run_desktop({});
     const std::string first = argv[1];
     if (first == "-h" || first == "--help" || first == "help") {
         usage(std::cout);
@@ -53,6 +52,10 @@ int main(int argc, char** argv) {
     }
     for (const auto& c : kCommands)
         if (first == c.name) return c.run(ondrel::Args(argv + 2, argv + argc));
+    // Anything else that names a file: open it (and those after it) in the desktop program.
+    std::error_code ec;
+    if (std::filesystem::exists(first, ec) || first.find('/') != std::string::npos || first.find('.') != std::string::npos)
+        return ondrel::run_desktop(std::vector<std::string>(argv + 1, argv + argc));
     std::cerr << "ondrel: unknown command '" << first << "'\n\n";
     usage(std::cerr);
     return ondrel::kExitUsage;

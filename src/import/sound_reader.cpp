@@ -262,26 +262,30 @@ bool read_sound(ByteReader& file, SoundKind kind, const std::string& path, const
     return true;
 }
 
+bool read_sound_file(const std::string& path, const std::string& mime, SampleRef& out, std::string& why) {
+    std::vector<uint8_t> bytes;
+    if (!read_file(path, bytes, why)) return false;
+    const SoundKind kind = sound_kind(path, mime);
+    if (kind == SoundKind::None) {
+        why = path + ": not a sound file the program reads";
+        return false;
+    }
+    ByteReader file(bytes);
+    if (!read_sound(file, kind, path, std::filesystem::path(path).filename().string(), out, why)) {
+        why = path + ": " + why;
+        return false;
+    }
+    return true;
+}
+
 LoadResult loadsnd(const std::string& path, const std::string& mime, SongBank& bank, int slot) {
     LoadResult result;
     if (slot < 0 || slot >= kSamplesPerSong) {
         result.error = "sound slots are numbered 1 to 128";
         return result;
     }
-    std::vector<uint8_t> bytes;
-    if (!read_file(path, bytes, result.error)) return result;
-    const SoundKind kind = sound_kind(path, mime);
-    if (kind == SoundKind::None) {
-        result.error = path + ": not a sound file the program reads";
-        return result;
-    }
-    ByteReader file(bytes);
     SampleRef sample;
-    std::string why;
-    if (!read_sound(file, kind, path, std::filesystem::path(path).filename().string(), sample, why)) {
-        result.error = path + ": " + why;
-        return result;
-    }
+    if (!read_sound_file(path, mime, sample, result.error)) return result;
     const int global = bank.current().sndbase + slot;
     bank.loadininst.store(static_cast<uint16_t>(slot), std::memory_order_relaxed);
     {

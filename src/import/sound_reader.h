@@ -24,6 +24,9 @@ SoundKind sound_kind(const std::string& path, const std::string& mime);
 bool read_sound(ByteReader& file, SoundKind kind, const std::string& path, const std::string& leaf,
                 SampleRef& out, std::string& why);
 
+// Reads a sound file into a new record; false with why set (one line, naming the file).
+bool read_sound_file(const std::string& path, const std::string& mime, SampleRef& out, std::string& why);
+
 // Replaces sound slot (0-based) of the current song with the file, the render callback
 // keeping off that slot meanwhile. The slot is untouched when the file cannot be read.
 LoadResult loadsnd(const std::string& path, const std::string& mime, SongBank& bank, int slot);

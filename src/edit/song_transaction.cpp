@@ -1,0 +1,116 @@
+#include "edit/song_transaction.h"
+
+#include <cstring>
+#include <mutex>
+
+namespace ondrel {
+
+PatternRef copy_pattern(const Pattern& pattern) {
+    auto copy = std::make_unique<Pattern>();
+    copy->nrows = pattern.nrows;
+    for (int t = 0; t < kTracks; ++t) {
+        if (!pattern.col[t]) continue;
+        copy->col[t] = std::make_unique_for_overwrite<TNOTE[]>(static_cast<size_t>(pattern.nrows));
+        std::memcpy(copy->col[t].get(), pattern.col[t].get(), sizeof(TNOTE) * size_t(pattern.nrows));
+    }
+    return copy;
+}
+
+SampleRef copy_sample(const p_s& sample) {
+    SampleRef copy = make_sample(sample.length);
+    uint8_t* const data = copy->data;
+    std::memcpy(static_cast<void*>(copy.get()), &sample, sizeof(p_s));
+    copy->data = sample.data ? data : nullptr;
+    if (sample.data && sample.length) std::memcpy(data, sample.data, sample.length);
+    return copy;
+}
+
+SongTransaction::SongTransaction(SongBank& bank, EffectSlots& slots, std::string label)
+    : bank_(bank), slots_(slots), label_(std::move(label)), song_(bank.noimod) {}
+
+TMOD& SongTransaction::record() {
+    if (!record_) {
+        // The sequencer writes a few fields while it plays: copy between buffers.
+        original_ = std::make_unique<TMOD>();
+        std::lock_guard<StructureLock> guard(bank_.structure_lock());
+        std::memcpy(static_cast<void*>(original_.get()), &live(), sizeof(TMOD));
+        record_ = std::make_unique<TMOD>(*original_);
+    }
+    return *record_;
+}
+
+Pattern* SongTransaction::pattern(int local) {
+    if (local < 0 || local >= kPatternsPerSong) return nullptr;
+    auto it = patterns_.find(local);
+    if (it == patterns_.end()) {
+        const Pattern* live_pattern = bank_.pattern(song_ * kPatternsPerSong + local);
+        if (!live_pattern) return nullptr;
+        it = patterns_.emplace(local, copy_pattern(*live_pattern)).first;
+    }
+    return it->second.get();
+}
+
+const Pattern* SongTransaction::view_pattern(int local) const {
+    if (local < 0 || local >= kPatternsPerSong) return nullptr;
+    const auto it = patterns_.find(local);
+    if (it != patterns_.end()) return it->second.get();
+    return bank_.pattern(song_ * kPatternsPerSong + local);
+}
+
+void SongTransaction::set_pattern(int local, PatternRef pattern) {
+    if (local < 0 || local >= kPatternsPerSong) return;
+    patterns_[local] = std::move(pattern);
+}
+
+p_s* SongTransaction::sample(int local) {
+    if (local < 0 || local >= kSamplesPerSong) return nullptr;
+    auto it = samples_.find(local);
+    if (it == samples_.end()) {
+        const p_s* live_sample = bank_.sample(song_ * kSamplesPerSong + local);
+        if (!live_sample) return nullptr;
+        it = samples_.emplace(local, copy_sample(*live_sample)).first;
+    }
+    return it->second.get();
+}
+
+const p_s* SongTransaction::view_sample(int local) const {
+    if (local < 0 || local >= kSamplesPerSong) return nullptr;
+    const auto it = samples_.find(local);
+    if (it != samples_.end()) return it->second.get();
+    return bank_.sample(song_ * kSamplesPerSong + local);
+}
+
+void SongTransaction::set_sample(int local, SampleRef sample) {
+    if (local < 0 || local >= kSamplesPerSong) return;
+    samples_[local] = std::move(sample);
+}
+
+std::array<int16_t, kEffectSlots>& SongTransaction::effect_types() {
+    if (!effect_types_) effect_types_ = slots_.efxtype;
+    return *effect_types_;
+}
+
+bool SongTransaction::changed() const {
+    if (!patterns_.empty() || !samples_.empty()) return true;
+    if (effect_types_ && *effect_types_ != slots_.efxtype) return true;
+    return record_ && std::memcmp(record_.get(), original_.get(), sizeof(TMOD)) != 0;
+}
+
+EditStep SongTransaction::commit() {
+    EditStep step;
+    step.label = label_;
+    step.song = song_;
+    if (!changed()) return step;
+    const bool record_changed = record_ && std::memcmp(record_.get(), original_.get(), sizeof(TMOD)) != 0;
+    if (record_changed) step.record = std::move(record_);
+    for (auto& [local, pattern] : patterns_) step.patterns.emplace_back(local, std::move(pattern));
+    for (auto& [local, sample] : samples_) step.samples.emplace_back(local, std::move(sample));
+    if (effect_types_ && *effect_types_ != slots_.efxtype) step.effect_types = effect_types_;
+    patterns_.clear();
+    samples_.clear();
+    swap_with_live(step, bank_, slots_, record_changed ? original_.get() : nullptr);
+    record_.reset();
+    return step;
+}
+
+}  // namespace ondrel

@@ -1,0 +1,67 @@
+#pragma once
+#include <functional>
+
+#include "shell/shell_message.h"
+
+namespace ondrel {
+
+class Program;
+
+// What the commands of the table do, by area. Each takes the program and the message.
+
+// Files: opening, saving, the file panel's replies.
+void cmd_new_song(Program& p, const ShellMessage& m);
+void cmd_open_song(Program& p, const ShellMessage& m);
+void cmd_open_files(Program& p, const ShellMessage& m);
+void cmd_save_song(Program& p, const ShellMessage& m);
+void cmd_save_song_as(Program& p, const ShellMessage& m);
+void cmd_save_song_to(Program& p, const ShellMessage& m);
+void cmd_save_sound(Program& p, const ShellMessage& m);
+void cmd_save_sound_to(Program& p, const ShellMessage& m);
+void cmd_quit(Program& p, const ShellMessage& m);
+// Saves the current song to its file, or asks for one; then runs next.
+void save_song_then(Program& p, const std::function<void()>& next);
+// Songs with unsaved changes written where the next start finds them.
+void keep_recovery_copies(Program& p);
+
+// The editor's place kept on the song's file: read after a song is opened, written after
+// it is saved.
+void restore_editor_position(Program& p);
+void store_editor_position(Program& p);
+
+// Songs in memory.
+void cmd_multiple_loading(Program& p, const ShellMessage& m);
+void cmd_kill_song(Program& p, const ShellMessage& m);
+void cmd_new_music(Program& p, const ShellMessage& m);
+void cmd_select_song(Program& p, const ShellMessage& m);
+
+// Options.
+void cmd_tempo_option(Program& p, const ShellMessage& m);
+void cmd_pan_mode(Program& p, const ShellMessage& m);
+void cmd_sound_quality(Program& p, const ShellMessage& m);
+void cmd_full_screen(Program& p, const ShellMessage& m);
+void cmd_vumeter(Program& p, const ShellMessage& m);
+void cmd_chord_entry(Program& p, const ShellMessage& m);
+void cmd_keyboard_layout(Program& p, const ShellMessage& m);
+
+// Transport.
+void cmd_play_song(Program& p, const ShellMessage& m);
+void cmd_play_pattern(Program& p, const ShellMessage& m);
+void cmd_stop(Program& p, const ShellMessage& m);
+void cmd_loop(Program& p, const ShellMessage& m);
+void cmd_song_ended(Program& p, const ShellMessage& m);
+void cmd_mute_track(Program& p, const ShellMessage& m);
+
+// Windows.
+void cmd_about(Program& p, const ShellMessage& m);
+void cmd_arrangement_follow(Program& p, const ShellMessage& m);
+void cmd_documentation(Program& p, const ShellMessage& m);
+
+// Editing that the shell itself does.
+void cmd_jump_step(Program& p, const ShellMessage& m);
+void cmd_cursor_to(Program& p, const ShellMessage& m);
+void cmd_edit_mode(Program& p, const ShellMessage& m);
+void cmd_undo(Program& p, const ShellMessage& m);
+void cmd_redo(Program& p, const ShellMessage& m);
+
+}  // namespace ondrel

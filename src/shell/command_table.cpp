@@ -1,0 +1,201 @@
+#include "shell/command_table.h"
+
+#include <array>
+
+#include "shell/command_handlers.h"
+#include "shell/program.h"
+
+namespace ondrel {
+
+namespace {
+
+constexpr KeyChord kNoKey{};
+
+bool can_undo(const Program& p) {
+    return p.history().can_undo();
+}
+bool can_redo(const Program& p) {
+    return p.history().can_redo();
+}
+bool has_sound(const Program& p) {
+    const p_s* s = p.engine.bank.song_sample(p.engine.player.cursor.cursnd);
+    return s && s->data && s->length;
+}
+
+// clang-format off
+const CommandInfo kCommands[] = {
+    // File
+    {fourcc("news"), "New Song", Menu::File, nullptr, kNoKey, cmd_new_song},
+    {fourcc("OPen"), "Open Song", Menu::File, nullptr, ctrl('o'), cmd_open_song},
+    {fourcc("SAve"), "Save Song", Menu::File, nullptr, ctrl('s'), cmd_save_song},
+    {fourcc("SAva"), "Save as...", Menu::File, nullptr, ctrl_shift('s'), cmd_save_song_as},
+    {fourcc("SAvm"), "Save as Midifile", Menu::File, nullptr, kNoKey, nullptr},
+    {fourcc("SAvs"), "Save Sound", Menu::File, nullptr, kNoKey, cmd_save_sound, has_sound},
+    {fourcc("abou"), "About Ondrel Tracker...", Menu::File, nullptr, kNoKey, cmd_about},
+    {fourcc("_QRQ"), "Quit", Menu::File, nullptr, ctrl('q'), cmd_quit},
+    // Edit
+    {fourcc("UNDO"), "Undo", Menu::Edit, nullptr, ctrl('z'), cmd_undo, can_undo},
+    {fourcc("REDO"), "Redo", Menu::Edit, nullptr, ctrl('y'), cmd_redo, can_redo},
+    {fourcc("REDO"), "Redo", Menu::None, nullptr, ctrl_shift('z'), cmd_redo, can_redo},
+    {fourcc("EDmd"), "Edit Mode", Menu::Edit, nullptr, plain(kKeySpace), cmd_edit_mode,
+     nullptr, [](const Program& p) { return p.editor.edit_mode; }},
+    // Pattern and track
+    {fourcc("Pclr"), "Pattern Clear", Menu::Pattern, nullptr, kNoKey, nullptr},
+    {fourcc("Pcut"), "Pattern Cut", Menu::Pattern, nullptr, ctrl('x'), nullptr},
+    {fourcc("Pcpy"), "Pattern Copy", Menu::Pattern, nullptr, kNoKey, nullptr},
+    {fourcc("Ppas"), "Pattern Paste", Menu::Pattern, nullptr, ctrl('v'), nullptr},
+    {fourcc("Tclr"), "Track Clear", Menu::Pattern, nullptr, kNoKey, nullptr},
+    {fourcc("Tcut"), "Track Cut", Menu::Pattern, nullptr, ctrl_shift('x'), nullptr},
+    {fourcc("Tcpy"), "Track Copy", Menu::Pattern, nullptr, kNoKey, nullptr},
+    {fourcc("Tpas"), "Track Paste", Menu::Pattern, nullptr, ctrl_shift('v'), nullptr},
+    // Positions
+    {fourcc("Tplu"), "Next Pos", Menu::Position, nullptr, kNoKey, nullptr},
+    {fourcc("Tmoi"), "Prev Pos", Menu::Position, nullptr, kNoKey, nullptr},
+    {fourcc("Tdel"), "Pos Delete", Menu::Position, nullptr, kNoKey, nullptr},
+    {fourcc("Tins"), "Pos Insert", Menu::Position, nullptr, kNoKey, nullptr},
+    {fourcc("Tnpt"), "New Pattern", Menu::Position, nullptr, kNoKey, nullptr},
+    {fourcc("Tppt"), "Next position & New Pattern", Menu::Position, nullptr, kNoKey, nullptr},
+    {fourcc("Trpt"), "Remove Pattern", Menu::Position, nullptr, kNoKey, nullptr},
+    // Jump step
+    {fourcc("J001"), "Jump 1 line", Menu::Pattern, "Jump", ctrl('1'), cmd_jump_step, nullptr,
+     [](const Program& p) { return p.engine.player.cursor.jumpstep == 1; }},
+    {fourcc("J002"), "Jump 2 lines", Menu::Pattern, "Jump", ctrl('2'), cmd_jump_step, nullptr,
+     [](const Program& p) { return p.engine.player.cursor.jumpstep == 2; }},
+    {fourcc("J003"), "Jump 3 lines", Menu::Pattern, "Jump", ctrl('3'), cmd_jump_step, nullptr,
+     [](const Program& p) { return p.engine.player.cursor.jumpstep == 3; }},
+    {fourcc("J004"), "Jump 4 lines", Menu::Pattern, "Jump", ctrl('4'), cmd_jump_step, nullptr,
+     [](const Program& p) { return p.engine.player.cursor.jumpstep == 4; }},
+    {fourcc("J005"), "Jump 5 lines", Menu::Pattern, "Jump", ctrl('5'), cmd_jump_step, nullptr,
+     [](const Program& p) { return p.engine.player.cursor.jumpstep == 5; }},
+    {fourcc("J006"), "Jump 6 lines", Menu::Pattern, "Jump", ctrl('6'), cmd_jump_step, nullptr,
+     [](const Program& p) { return p.engine.player.cursor.jumpstep == 6; }},
+    {fourcc("J007"), "Jump 7 lines", Menu::Pattern, "Jump", ctrl('7'), cmd_jump_step, nullptr,
+     [](const Program& p) { return p.engine.player.cursor.jumpstep == 7; }},
+    {fourcc("J008"), "Jump 8 lines", Menu::Pattern, "Jump", ctrl('8'), cmd_jump_step, nullptr,
+     [](const Program& p) { return p.engine.player.cursor.jumpstep == 8; }},
+    // Song-wide
+    {fourcc("Rsnd"), "Remove Sounds", Menu::Song, nullptr, kNoKey, nullptr},
+    {fourcc("Rseq"), "Remove Sequence", Menu::Song, nullptr, kNoKey, nullptr},
+    {fourcc("Rall"), "Remove All", Menu::Song, nullptr, kNoKey, nullptr},
+    {fourcc("FIIT"), "Find instruments not used in the music", Menu::Song, nullptr, kNoKey, nullptr},
+    {fourcc("CUIT"), "Find current instrument", Menu::Song, nullptr, kNoKey, nullptr},
+    // Windows
+    {fourcc("wmed"), "Documentation", Menu::Windows, nullptr, kNoKey, cmd_documentation},
+    {fourcc("itli"), "Instrument List", Menu::Windows, nullptr, kNoKey, nullptr},
+    {fourcc("arra"), "Arrangement", Menu::Windows, nullptr, kNoKey, nullptr},
+    {fourcc("wfft"), "FFT Window", Menu::Windows, nullptr, kNoKey, nullptr},
+    // Songs in memory
+    {fourcc("MulL"), "Multiple Music Loading", Menu::Music, nullptr, kNoKey, cmd_multiple_loading, nullptr,
+     [](const Program& p) { return p.engine.bank.fmulload != 0; }},
+    {fourcc("kiLL"), "Kill current Music", Menu::Music, nullptr, kNoKey, cmd_kill_song},
+    {fourcc("NEWM"), "New Music", Menu::Music, nullptr, kNoKey, cmd_new_music},
+    {fourcc("ZI00"), "No name", Menu::Music, nullptr, kNoKey, cmd_select_song, nullptr, nullptr,
+     kMaxSongMenuItems},
+    // Options
+    {fourcc("GOte"), "Tempo", Menu::Options, nullptr, kNoKey, cmd_tempo_option, nullptr,
+     [](const Program& p) { return p.engine.mixer.ftemp != 0; }},
+    {fourcc("Mfil"), "File Mode", Menu::Options, "Play Mode", kNoKey, cmd_pan_mode},
+    {fourcc("Mami"), "Amiga Mode", Menu::Options, "Play Mode", kNoKey, cmd_pan_mode, nullptr,
+     [](const Program& p) { return p.engine.bank.current().mode == 1; }},
+    {fourcc("Mler"), "L&R Mode", Menu::Options, "Play Mode", kNoKey, cmd_pan_mode, nullptr,
+     [](const Program& p) { return p.engine.bank.current().mode == 3; }},
+    {fourcc("Mpan"), "Panoramic Mode", Menu::Options, "Play Mode", kNoKey, cmd_pan_mode, nullptr,
+     [](const Program& p) { return p.engine.bank.current().mode == 2; }},
+    {fourcc("Mnor"), "Normal", Menu::Options, "Sound Quality", kNoKey, cmd_sound_quality, nullptr,
+     [](const Program& p) { return p.engine.mixer.qual == 0; }},
+    {fourcc("Mint"), "Interpolation", Menu::Options, "Sound Quality", kNoKey, cmd_sound_quality, nullptr,
+     [](const Program& p) { return p.engine.mixer.qual == 1; }},
+    {fourcc("full"), "Full Screen", Menu::Options, nullptr, kNoKey, cmd_full_screen, nullptr,
+     [](const Program& p) { return p.windows.full_screen; }},
+    {fourcc("vuvu"), "Vumeter", Menu::Options, nullptr, kNoKey, cmd_vumeter, nullptr,
+     [](const Program& p) { return p.engine.player.tr.fvuvu != 0; }},
+    {fourcc("accd"), "Accord Edit", Menu::Options, nullptr, kNoKey, cmd_chord_entry, nullptr,
+     [](const Program& p) { return p.engine.player.tr.faccedit != 0; }},
+    {fourcc("ATRI"), "Atari", Menu::Options, nullptr, kNoKey, cmd_keyboard_layout, nullptr,
+     [](const Program& p) { return p.editor.layout == KeyboardLayout::Atari; }},
+    {fourcc("AMIG"), "Amiga", Menu::Options, nullptr, kNoKey, cmd_keyboard_layout, nullptr,
+     [](const Program& p) { return p.editor.layout == KeyboardLayout::Amiga; }},
+    // The transport buttons and keys
+    {fourcc("PLsg"), "Play Song", Menu::None, nullptr, plain(kKeyF1 + 4), cmd_play_song},
+    {fourcc("PLpt"), "Play Pattern", Menu::None, nullptr, plain(kKeyF1 + 5), cmd_play_pattern},
+    {fourcc("PLst"), "Stop", Menu::None, nullptr, plain(kKeyF1 + 7), cmd_stop},
+    {fourcc("PLlp"), "loop", Menu::None, nullptr, kNoKey, cmd_loop, nullptr,
+     [](const Program& p) { return p.engine.player.tr.floop != 0; }},
+    {fourcc("MUTE"), "Mute track", Menu::None, nullptr, kNoKey, cmd_mute_track},
+    {fourcc("CUto"), "Move the cursor", Menu::None, nullptr, kNoKey, cmd_cursor_to},
+    // Between windows and threads
+    {fourcc("refs"), "Open files", Menu::None, nullptr, kNoKey, cmd_open_files},
+    {fourcc("SAvt"), "Save song to file", Menu::None, nullptr, kNoKey, cmd_save_song_to},
+    {fourcc("SSvt"), "Save sound to file", Menu::None, nullptr, kNoKey, cmd_save_sound_to},
+    {fourcc("stop"), "Song ended", Menu::None, nullptr, kNoKey, cmd_song_ended},
+    {fourcc("acti"), "Play started or stopped", Menu::None, nullptr, kNoKey, cmd_arrangement_follow},
+    {fourcc("doup"), "Cursor jumped", Menu::None, nullptr, kNoKey, cmd_arrangement_follow},
+    {fourcc("midi"), "MIDI note", Menu::None, nullptr, kNoKey, nullptr},
+    {fourcc("moni"), "Monitor", Menu::None, nullptr, kNoKey, nullptr},
+    {fourcc("reco"), "Record", Menu::None, nullptr, kNoKey, nullptr},
+    {fourcc("stre"), "Stop recording", Menu::None, nullptr, kNoKey, nullptr},
+    // The file browser
+    {fourcc("GO00"), "Add Path To music", Menu::BrowserPaths, nullptr, kNoKey, nullptr},
+    {fourcc("GO01"), "Add Path To sound", Menu::BrowserPaths, nullptr, kNoKey, nullptr},
+    {fourcc("GO02"), "Remove path", Menu::BrowserPaths, nullptr, kNoKey, nullptr},
+    {fourcc("seea"), "See All Files", Menu::Browser, nullptr, kNoKey, nullptr},
+    {fourcc("seed"), "See All Directory", Menu::Browser, nullptr, kNoKey, nullptr},
+    {fourcc("see1"), "See Directory with audio sound level 1", Menu::Browser, nullptr, kNoKey, nullptr},
+    {fourcc("seeA"), "See Directory with audio sound all levels", Menu::Browser, nullptr, kNoKey, nullptr},
+    {fourcc("find"), "Find all audio files", Menu::Browser, nullptr, kNoKey, nullptr},
+    {fourcc("NDMN"), "Refresh", Menu::Browser, nullptr, kNoKey, nullptr},
+    {fourcc("abou"), "About...", Menu::Browser, nullptr, kNoKey, cmd_about},
+    // The instrument editor's envelope selector
+    {fourcc("co00"), "Velocity", Menu::Envelope, nullptr, kNoKey, nullptr},
+    {fourcc("co01"), "Efx Env", Menu::Envelope, nullptr, kNoKey, nullptr},
+    {fourcc("co02"), "Panoramic", Menu::Envelope, nullptr, kNoKey, nullptr},
+    {fourcc("co03"), "Coarse tune", Menu::Envelope, nullptr, kNoKey, nullptr},
+    {fourcc("co04"), "Velocity off", Menu::Envelope, nullptr, kNoKey, nullptr},
+    // The analyser's menus
+    {fourcc("FFTs"), "Song", Menu::Analyser, "Source", kNoKey, nullptr},
+    {fourcc("FFTi"), "Input", Menu::Analyser, "Source", kNoKey, nullptr},
+    {fourcc("FTv0"), "Classic", Menu::Analyser, "View", kNoKey, nullptr},
+    {fourcc("FTv1"), "Radar", Menu::Analyser, "View", kNoKey, nullptr},
+};
+// clang-format on
+
+}  // namespace
+
+std::span<const CommandInfo> command_table() {
+    return kCommands;
+}
+
+const CommandInfo* find_command(uint32_t code) {
+    for (const CommandInfo& c : kCommands)
+        if (code >= c.code && code - c.code < c.family) return &c;
+    return nullptr;
+}
+
+const CommandInfo* command_for_shortcut(const KeyChord& chord) {
+    if (chord.empty()) return nullptr;
+    for (const CommandInfo& c : kCommands)
+        if (c.shortcut == chord) return &c;
+    return nullptr;
+}
+
+const char* menu_title(Menu menu) {
+    switch (menu) {
+        case Menu::File: return "File";
+        case Menu::Edit: return "Edit";
+        case Menu::Pattern: return "Pattern";
+        case Menu::Position: return "Position";
+        case Menu::Song: return "Song";
+        case Menu::Windows: return "Windows";
+        case Menu::Music: return "Music";
+        case Menu::Options: return "Options";
+        case Menu::Midi: return "MIDI";
+        case Menu::Browser: return "Browser";
+        case Menu::BrowserPaths: return "Paths";
+        case Menu::Envelope: return "A.D.S.R.";
+        case Menu::Analyser: return "FFT Window";
+        case Menu::None: break;
+    }
+    return "";
+}
+
+}  // namespace ondrel

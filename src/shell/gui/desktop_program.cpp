@@ -1,0 +1,60 @@
+#include "shell/gui/desktop_program.h"
+
+#include <csignal>
+#include <cstdio>
+#include <iostream>
+
+#include "platform/sdl_audio_output.h"
+#include "shell/gui/gui_host.h"
+#include "shell/gui/main_window.h"
+#include "shell/program.h"
+
+namespace ondrel {
+
+namespace {
+
+constexpr int kDeviceFrames = 512;  // about 12 ms: notes typed are heard at once
+std::atomic<bool> g_interrupted{false};
+
+extern "C" void on_quit_signal(int) {
+    g_interrupted.store(true);
+}
+
+void catch_quit_signals() {
+    struct sigaction action {};
+    action.sa_handler = on_quit_signal;
+    sigemptyset(&action.sa_mask);
+    sigaction(SIGTERM, &action, nullptr);
+    sigaction(SIGINT, &action, nullptr);
+}
+
+}  // namespace
+
+int run_desktop(const std::vector<std::string>& files) {
+    Program program;
+    GuiHost host;
+    std::string why;
+    if (!host.open(why)) {
+        std::cerr << "ondrel: " << why
+                  << "; 'ondrel play FILE' and 'ondrel render FILE -o OUT.wav' work without one\n";
+        return 2;
+    }
+    catch_quit_signals();
+    SdlAudioOutput audio(program.engine.mixer, program.engine.player, program.engine.bank);
+    if (!audio.open(kDeviceFrames, why)) {
+        program.audio_status = "no sound device";
+        std::cerr << "ondrel: " << why << "\n";
+    }
+    program.on_quit = [&program] { program.engine.player.stoppi(); };
+    if (!files.empty()) {
+        ShellMessage open(fourcc("refs"));
+        open.refs = files;
+        program.post(std::move(open));
+    }
+    MainWindow window(program);
+    host.run(program, window, g_interrupted);
+    audio.close();
+    return 0;
+}
+
+}  // namespace ondrel

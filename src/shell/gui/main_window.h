@@ -1,0 +1,34 @@
+#pragma once
+#include <memory>
+
+#include "shell/gui/file_panel.h"
+#include "shell/gui/pattern_view.h"
+#include "song/tmod.h"
+
+namespace ondrel {
+
+class Program;
+
+// The whole window, one frame at a time: the menu bar, the transport, the pattern view and
+// the panes, the status line, and the alerts, panels and secondary windows above them.
+// It draws from the program's state and posts commands; it never changes the song itself.
+class MainWindow {
+public:
+    explicit MainWindow(Program& program);
+    void draw();
+    // Something on screen moves by itself (play, meters, a search): draw often.
+    bool animating() const;
+
+private:
+    void take_song_snapshot();
+    void draw_panes(float top, float height);
+
+    Program& p_;
+    // The current song's record as of this frame: the sequencer writes a few fields while
+    // it plays, so the window reads a copy taken between two buffers.
+    std::unique_ptr<TMOD> song_;
+    PatternView pattern_view_;
+    FilePanel file_panel_;
+};
+
+}  // namespace ondrel

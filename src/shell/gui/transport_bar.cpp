@@ -1,0 +1,77 @@
+#include "shell/gui/transport_bar.h"
+
+#include <imgui.h>
+
+#include <algorithm>
+#include <cstdio>
+
+#include "shell/command_table.h"
+#include "shell/program.h"
+
+namespace ondrel {
+
+namespace {
+
+void command_button(Program& p, uint32_t code, const char* label, bool lit = false) {
+    if (lit) ImGui::PushStyleColor(ImGuiCol_Button, ImVec4(0.20f, 0.45f, 0.25f, 1));
+    if (ImGui::Button(label)) p.post(code);
+    if (lit) ImGui::PopStyleColor();
+    if (ImGui::IsItemHovered()) {
+        if (const CommandInfo* c = find_command(code); c && !c->shortcut.empty())
+            ImGui::SetTooltip("%s", chord_text(c->shortcut).c_str());
+    }
+    ImGui::SameLine();
+}
+
+void meter(const char* label, float value) {
+    ImGui::TextUnformatted(label);
+    ImGui::SameLine();
+    const ImVec4 colour = value >= 1.0f ? ImVec4(0.9f, 0.2f, 0.2f, 1) : ImVec4(0.3f, 0.8f, 0.35f, 1);
+    ImGui::PushStyleColor(ImGuiCol_PlotHistogram, colour);
+    ImGui::ProgressBar(std::clamp(value, 0.0f, 1.0f), ImVec2(90, ImGui::GetTextLineHeight()), "");
+    ImGui::PopStyleColor();
+    ImGui::SameLine();
+}
+
+}  // namespace
+
+float draw_transport_bar(Program& p, const TMOD& song, float top) {
+    const ImGuiViewport* view = ImGui::GetMainViewport();
+    const float height = ImGui::GetFrameHeightWithSpacing() * 2 + 8;
+    ImGui::SetNextWindowPos(ImVec2(0, top));
+    ImGui::SetNextWindowSize(ImVec2(view->Size.x, height));
+    ImGui::Begin("##transport", nullptr,
+                 ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove | ImGuiWindowFlags_NoSavedSettings);
+    const Player& player = p.engine.player;
+    const Transport& tr = player.tr;
+    const bool playing = tr.playing != 0;
+    command_button(p, fourcc("PLsg"), "Play Song", playing && !tr.playp);
+    command_button(p, fourcc("PLpt"), "Play Pattern", playing && tr.playp);
+    command_button(p, fourcc("PLst"), "Stop");
+    bool loop = tr.floop != 0;
+    if (ImGui::Checkbox("loop", &loop)) p.post(fourcc("PLlp"));
+    ImGui::SameLine(0, 24);
+
+    const int position = std::clamp<int>(tr.nopat, 0, kPositions - 1);
+    const double seconds = playing ? double(system_time_us() - uint64_t(tr.startplaying.load())) / 1e6 : 0.0;
+    ImGui::Text("Pos %03d/%03d  Pattern %03d  Row %03d  Time %02d:%02d", position, song.nbpos, song.sequence[position],
+                int(tr.nopos), int(seconds) / 60, int(seconds) % 60);
+    ImGui::SameLine(0, 24);
+    ImGui::Text("BPM %u  Speed %d", song.tempo ? 60000000u / song.tempo : 0u, int(song.speed));
+    ImGui::SameLine(0, 24);
+    const Mixer& mixer = p.engine.mixer;
+    meter("L", mixer.lmax.load(std::memory_order_relaxed));
+    meter("R", mixer.rmax.load(std::memory_order_relaxed));
+    ImGui::Text("Load %3.0f%%", 100.0f * mixer.powermusic.load(std::memory_order_relaxed));
+
+    const int instrument = player.cursor.cursnd + 1;
+    const p_s* sound = p.engine.bank.song_sample(instrument - 1);
+    ImGui::Text("Octave %d  Step %d  Instrument %02d %s", p.editor.octave, int(player.cursor.jumpstep), instrument,
+                sound ? sound->name : "(empty)");
+    ImGui::SameLine(0, 24);
+    ImGui::Text("Song \"%s\"  %d tracks", song.name[0] ? song.name : "No name", int(song.nbtrack));
+    ImGui::End();
+    return height;
+}
+
+}  // namespace ondrel
