@@ -9,7 +9,9 @@ size_t EditStep::bytes() const {
     size_t n = sizeof(EditStep) + label.size();
     if (record) n += sizeof(TMOD);
     for (const auto& [local, pattern] : patterns)
-        if (pattern) n += sizeof(Pattern) + size_t(pattern->allocated_tracks()) * size_t(pattern->nrows) * sizeof(TNOTE);
+        if (pattern)
+            n += sizeof(Pattern) +
+                 size_t(pattern->allocated_tracks()) * size_t(pattern->nrows) * sizeof(TNOTE);
     for (const auto& [local, sample] : samples)
         if (sample) n += sizeof(p_s) + sample->length + kSampleSlack;
     if (effect_types) n += sizeof(*effect_types);

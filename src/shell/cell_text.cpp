@@ -19,16 +19,25 @@ char command_char(int command) {
 
 CellText cell_text(const TNOTE& cell) {
     CellText t{};
-    if (cell.note & 0x80) std::snprintf(t.note, sizeof t.note, "OFF ");
-    else if (cell.note) const_midit(cell.note, t.note);
-    else std::snprintf(t.note, sizeof t.note, "--- ");
+    if (cell.note & 0x80)
+        std::snprintf(t.note, sizeof t.note, "OFF ");
+    else if (cell.note)
+        const_midit(cell.note, t.note);
+    else
+        std::snprintf(t.note, sizeof t.note, "--- ");
 
-    if (!cell.instrument) std::snprintf(t.instrument, sizeof t.instrument, "..");
-    else if (cell.instrument < 100) std::snprintf(t.instrument, sizeof t.instrument, "%02d", cell.instrument);
-    else std::snprintf(t.instrument, sizeof t.instrument, "%c%d", 'A' + cell.instrument / 10 - 10, cell.instrument % 10);
+    if (!cell.instrument)
+        std::snprintf(t.instrument, sizeof t.instrument, "..");
+    else if (cell.instrument < 100)
+        std::snprintf(t.instrument, sizeof t.instrument, "%02d", cell.instrument);
+    else
+        std::snprintf(t.instrument, sizeof t.instrument, "%c%d", 'A' + cell.instrument / 10 - 10,
+                      cell.instrument % 10);
 
-    if (!cell.volume) std::snprintf(t.volume, sizeof t.volume, "...");
-    else std::snprintf(t.volume, sizeof t.volume, "%03d", cell.volume);
+    if (!cell.volume)
+        std::snprintf(t.volume, sizeof t.volume, "...");
+    else
+        std::snprintf(t.volume, sizeof t.volume, "%03d", cell.volume);
 
     if (!cell.command && !cell.parameter) {
         std::snprintf(t.command, sizeof t.command, ".");

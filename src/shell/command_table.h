@@ -36,7 +36,7 @@ struct CommandInfo {
     Menu menu;
     const char* submenu;  // null: directly in the menu
     KeyChord shortcut;
-    CommandHandler handler;        // null: not available in this build
+    CommandHandler handler;         // null: not available in this build
     CommandTest enabled = nullptr;  // null: always when there is a handler
     CommandTest checked = nullptr;  // null: not a toggle
     uint32_t family = 1;            // codes code .. code + family - 1 share the entry

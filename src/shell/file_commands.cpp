@@ -55,11 +55,15 @@ void open_module(Program& p, const std::string& path, const std::function<void()
         const LoadResult r = load(path, bank, p.engine.slots);
         if (!r.ok) {
             // The reader's own alert, when it raised one, says it; otherwise say why here.
-            if (p.alerts.size() == alerts_before) tell_failure(p, r.error);
-            else p.say(r.error);
+            if (p.alerts.size() == alerts_before)
+                tell_failure(p, r.error);
+            else
+                p.say(r.error);
         } else {
-            if (bank.nbimod > songs_before) p.song_added();
-            else p.song_replaced(r.song);
+            if (bank.nbimod > songs_before)
+                p.song_added();
+            else
+                p.song_replaced(r.song);
             p.engine.player.tr.nopat = 0;
             p.engine.player.tr.nopos = 0;
             p.engine.player.cursor.poscurv = 0;
@@ -69,8 +73,10 @@ void open_module(Program& p, const std::string& path, const std::function<void()
         }
         if (next) next();
     };
-    if (p.engine.bank.fmulload) go();
-    else p.unless_changes_lost(go);
+    if (p.engine.bank.fmulload)
+        go();
+    else
+        p.unless_changes_lost(go);
 }
 
 void open_sound(Program& p, const std::string& path) {

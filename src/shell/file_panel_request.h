@@ -13,7 +13,7 @@ struct FilePanelRequest {
     uint32_t reply_code = 0;  // posted with the chosen path
     std::string title;
     std::string directory;
-    std::string suggested_name;  // for saving
+    std::string suggested_name;       // for saving
     std::function<void()> after;      // runs once the chosen file has been handled
     std::function<void()> on_cancel;  // runs when the panel is closed without a file
     bool open() const { return mode != Mode::Closed; }

@@ -35,7 +35,8 @@ std::string chord_text(const KeyChord& chord) {
     if (chord.mods & kModCtrl) text += "Ctrl+";
     if (chord.mods & kModAlt) text += "Alt+";
     if (chord.mods & kModShift) text += "Shift+";
-    if (chord.key >= kKeyF1 && chord.key <= kKeyF12) return text + "F" + std::to_string(chord.key - kKeyF1 + 1);
+    if (chord.key >= kKeyF1 && chord.key <= kKeyF12)
+        return text + "F" + std::to_string(chord.key - kKeyF1 + 1);
     if (const char* name = special_name(chord.key)) return text + name;
     if (chord.key > ' ' && chord.key < 127) {
         const char c = static_cast<char>(chord.key);

@@ -40,9 +40,15 @@ struct KeyChord {
     bool empty() const { return key == kKeyNone; }
 };
 
-constexpr KeyChord ctrl(int32_t key) { return {key, kModCtrl}; }
-constexpr KeyChord ctrl_shift(int32_t key) { return {key, kModCtrl | kModShift}; }
-constexpr KeyChord plain(int32_t key) { return {key, kModNone}; }
+constexpr KeyChord ctrl(int32_t key) {
+    return {key, kModCtrl};
+}
+constexpr KeyChord ctrl_shift(int32_t key) {
+    return {key, kModCtrl | kModShift};
+}
+constexpr KeyChord plain(int32_t key) {
+    return {key, kModNone};
+}
 
 // "Ctrl+Shift+S", "F5": how menus show a shortcut.
 std::string chord_text(const KeyChord& chord);

@@ -71,7 +71,8 @@ const EditHistory& Program::history() const {
 }
 
 bool Program::song_dirty(int song) const {
-    return song >= 0 && static_cast<size_t>(song) < histories_.size() && histories_[static_cast<size_t>(song)].dirty();
+    return song >= 0 && static_cast<size_t>(song) < histories_.size() &&
+           histories_[static_cast<size_t>(song)].dirty();
 }
 
 bool Program::edit(const std::string& label, const std::function<void(SongTransaction&)>& change) {
@@ -131,15 +132,17 @@ void Program::unless_changes_lost(const std::function<void()>& go) {
         return;
     }
     alerts.ask(changes_question(), [this, go](int button) {
-                   if (button == kAnswerDontSave) go();
-                   if (button == kAnswerSave) save_song_then(*this, go);
-               });
+        if (button == kAnswerDontSave) go();
+        if (button == kAnswerSave) save_song_then(*this, go);
+    });
 }
 
 Alert Program::changes_question() const {
     const TMOD& song = engine.bank.current();
     const std::string name = song.name[0] ? song.name : "No name";
-    return {"title", "The song \"" + name + "\" has changes that are not saved.", {"Save", "Don't Save", "Cancel"}};
+    return {"title",
+            "The song \"" + name + "\" has changes that are not saved.",
+            {"Save", "Don't Save", "Cancel"}};
 }
 
 void Program::request_quit() {
@@ -153,18 +156,18 @@ void Program::ask_next_dirty_song_then_quit(int from) {
         if (!song_dirty(s)) continue;
         engine.bank.select(s);
         alerts.ask(changes_question(), [this, s](int button) {
-                       if (button == kAnswerCancel) {
-                           quit_state_ = QuitState::Running;
-                           return;
-                       }
-                       if (button == kAnswerDontSave) {
-                           ask_next_dirty_song_then_quit(s + 1);
-                           return;
-                       }
-                       save_song_then(*this, [this, s] { ask_next_dirty_song_then_quit(s + 1); });
-                       // A save panel closed without saving cancels the quit.
-                       if (file_panel.open()) file_panel.on_cancel = [this] { quit_state_ = QuitState::Running; };
-                   });
+            if (button == kAnswerCancel) {
+                quit_state_ = QuitState::Running;
+                return;
+            }
+            if (button == kAnswerDontSave) {
+                ask_next_dirty_song_then_quit(s + 1);
+                return;
+            }
+            save_song_then(*this, [this, s] { ask_next_dirty_song_then_quit(s + 1); });
+            // A save panel closed without saving cancels the quit.
+            if (file_panel.open()) file_panel.on_cancel = [this] { quit_state_ = QuitState::Running; };
+        });
         return;
     }
     if (on_quit) on_quit();

@@ -16,8 +16,10 @@ void cmd_kill_song(Program& p, const ShellMessage&) {
         const int song = bank.noimod;
         const bool last = bank.nbimod <= 1;
         bank.killmusic();
-        if (last) p.song_replaced(0);
-        else p.song_removed(song);
+        if (last)
+            p.song_replaced(0);
+        else
+            p.song_removed(song);
         p.engine.player.tr.nopat = 0;
         p.engine.player.cursor.poscurv = 0;
         p.say("Kill current Music");

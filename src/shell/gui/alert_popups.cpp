@@ -24,7 +24,9 @@ void draw_alerts(Program& p) {
     const ImGuiViewport* view = ImGui::GetMainViewport();
     ImGui::SetNextWindowPos(ImVec2(view->Size.x / 2, view->Size.y / 2), ImGuiCond_Always, ImVec2(0.5f, 0.5f));
     ImGui::SetNextWindowSizeConstraints(ImVec2(320, 0), ImVec2(640, 600));
-    if (!ImGui::BeginPopupModal(kId, nullptr, ImGuiWindowFlags_AlwaysAutoResize | ImGuiWindowFlags_NoTitleBar)) return;
+    if (!ImGui::BeginPopupModal(kId, nullptr,
+                                ImGuiWindowFlags_AlwaysAutoResize | ImGuiWindowFlags_NoTitleBar))
+        return;
     ImGui::Spacing();
     ImGui::PushTextWrapPos(600);
     ImGui::TextUnformatted(alert->text.c_str());
@@ -38,8 +40,10 @@ void draw_alerts(Program& p) {
         if (ImGui::Button(alert->buttons[static_cast<size_t>(i)].c_str(), ImVec2(110, 0))) chosen = i;
     }
     if (count == 0 && ImGui::Button("OK", ImVec2(110, 0))) chosen = 0;
-    if (chosen < 0 && ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Escape))) chosen = escape_button(*alert);
-    if (chosen < 0 && ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Enter))) chosen = count > 0 ? count - 1 : 0;
+    if (chosen < 0 && ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Escape)))
+        chosen = escape_button(*alert);
+    if (chosen < 0 && ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Enter)))
+        chosen = count > 0 ? count - 1 : 0;
     if (chosen >= 0) {
         ImGui::CloseCurrentPopup();
         ImGui::EndPopup();

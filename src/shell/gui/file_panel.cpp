@@ -77,29 +77,32 @@ void FilePanel::draw(Program& p) {
     constexpr const char* kId = "File##panel";
     if (!was_open_) {
         std::error_code ec;
-        list(request.directory.empty() || !fs::is_directory(request.directory, ec) ? fs::current_path(ec).string()
-                                                                                   : request.directory);
+        list(request.directory.empty() || !fs::is_directory(request.directory, ec)
+                 ? fs::current_path(ec).string()
+                 : request.directory);
         copy_text(name_, sizeof name_, request.suggested_name);
         confirm_replace_.clear();
         ImGui::OpenPopup(kId);
         was_open_ = true;
     }
     const ImGuiViewport* view = ImGui::GetMainViewport();
-    ImGui::SetNextWindowPos(ImVec2(view->Size.x / 2, view->Size.y / 2), ImGuiCond_Appearing, ImVec2(0.5f, 0.5f));
+    ImGui::SetNextWindowPos(ImVec2(view->Size.x / 2, view->Size.y / 2), ImGuiCond_Appearing,
+                            ImVec2(0.5f, 0.5f));
     ImGui::SetNextWindowSize(ImVec2(640, 480), ImGuiCond_Appearing);
     if (!ImGui::BeginPopupModal(kId, nullptr, ImGuiWindowFlags_NoSavedSettings)) return;
     ImGui::TextUnformatted(request.title.c_str());
     if (ImGui::Button("Up")) list(fs::path(directory_).parent_path().string());
     ImGui::SameLine();
     ImGui::SetNextItemWidth(-1);
-    if (ImGui::InputText("##directory", directory_text_, sizeof directory_text_, ImGuiInputTextFlags_EnterReturnsTrue))
+    if (ImGui::InputText("##directory", directory_text_, sizeof directory_text_,
+                         ImGuiInputTextFlags_EnterReturnsTrue))
         list(directory_text_);
     const float list_height = ImGui::GetContentRegionAvail().y - ImGui::GetFrameHeightWithSpacing() * 2 - 8;
     ImGui::BeginChild("##entries", ImVec2(0, list_height), true);
     if (!error_.empty()) ImGui::TextColored(ImVec4(1, 0.5f, 0.4f, 1), "%s", error_.c_str());
     std::string open_now;
     for (const Entry& e : entries_) {
-        const ImVec4 colour = e.directory ? ImVec4(0.6f, 0.8f, 1, 1)
+        const ImVec4 colour = e.directory             ? ImVec4(0.6f, 0.8f, 1, 1)
                               : e.kind == kModuleFile ? ImVec4(1, 1, 1, 1)
                               : e.kind == kSoundFile  ? ImVec4(0.6f, 1, 0.6f, 1)
                                                       : ImVec4(0.55f, 0.55f, 0.6f, 1);
@@ -119,13 +122,16 @@ void FilePanel::draw(Program& p) {
     const bool saving = request.mode == FilePanelRequest::Mode::Save;
     const bool ok = ImGui::Button(saving ? "Save" : "Open", ImVec2(100, 0));
     ImGui::SameLine();
-    const bool cancel = ImGui::Button("Cancel", ImVec2(100, 0)) || ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Escape));
+    const bool cancel =
+        ImGui::Button("Cancel", ImVec2(100, 0)) || ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Escape));
     if (!confirm_replace_.empty()) {
         ImGui::TextColored(ImVec4(1, 0.8f, 0.4f, 1), "%s exists: Save again to replace it.",
                            fs::path(confirm_replace_).filename().string().c_str());
     }
-    if (!open_now.empty()) choose(p, open_now);
-    else if (ok || entered) choose(p, name_);
+    if (!open_now.empty())
+        choose(p, open_now);
+    else if (ok || entered)
+        choose(p, name_);
     if (cancel) p.file_panel_closed();
     if (!p.file_panel.open()) {
         ImGui::CloseCurrentPopup();

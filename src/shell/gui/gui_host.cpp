@@ -48,8 +48,8 @@ bool GuiHost::open(std::string& why) {
         why = std::string("cannot open the desktop window: ") + SDL_GetError();
         return false;
     }
-    window_ = SDL_CreateWindow("Ondrel Tracker", SDL_WINDOWPOS_CENTERED, SDL_WINDOWPOS_CENTERED, kWidth, kHeight,
-                               SDL_WINDOW_RESIZABLE | SDL_WINDOW_ALLOW_HIGHDPI);
+    window_ = SDL_CreateWindow("Ondrel Tracker", SDL_WINDOWPOS_CENTERED, SDL_WINDOWPOS_CENTERED, kWidth,
+                               kHeight, SDL_WINDOW_RESIZABLE | SDL_WINDOW_ALLOW_HIGHDPI);
     if (!window_) {
         why = std::string("cannot open the desktop window: ") + SDL_GetError();
         return false;
@@ -95,7 +95,8 @@ void GuiHost::handle_event(Program& program, const SDL_Event& event) {
             break;
         }
         case SDL_KEYDOWN:
-            if (!io.WantCaptureKeyboard && !io.WantTextInput && program.alerts.empty() && !program.file_panel.open())
+            if (!io.WantCaptureKeyboard && !io.WantTextInput && program.alerts.empty() &&
+                !program.file_panel.open())
                 program.key_down(chord_of(event.key.keysym), event.key.repeat != 0);
             break;
         case SDL_KEYUP:
@@ -146,7 +147,8 @@ bool GuiHost::screenshot(const std::string& path) const {
     if (!renderer_ || SDL_GetRendererOutputSize(renderer_, &w, &h) != 0) return false;
     SDL_Surface* shot = SDL_CreateRGBSurfaceWithFormat(0, w, h, 32, SDL_PIXELFORMAT_ARGB8888);
     if (!shot) return false;
-    const bool read = SDL_RenderReadPixels(renderer_, nullptr, SDL_PIXELFORMAT_ARGB8888, shot->pixels, shot->pitch) == 0;
+    const bool read =
+        SDL_RenderReadPixels(renderer_, nullptr, SDL_PIXELFORMAT_ARGB8888, shot->pixels, shot->pitch) == 0;
     const bool saved = read && SDL_SaveBMP(shot, path.c_str()) == 0;
     SDL_FreeSurface(shot);
     return saved;

@@ -49,7 +49,8 @@ void MainWindow::draw_panes(float top, float height) {
     ImGui::SetNextWindowPos(ImVec2(0, top));
     ImGui::SetNextWindowSize(ImVec2(view->Size.x, height));
     constexpr ImGuiWindowFlags kPane = ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove |
-                                       ImGuiWindowFlags_NoSavedSettings | ImGuiWindowFlags_NoBringToFrontOnFocus;
+                                       ImGuiWindowFlags_NoSavedSettings |
+                                       ImGuiWindowFlags_NoBringToFrontOnFocus;
     ImGui::PushStyleVar(ImGuiStyleVar_WindowPadding, ImVec2(4, 4));
     ImGui::Begin("##panes", nullptr, kPane);
     pattern_view_.draw(p_, *song_, ImGui::GetContentRegionAvail());

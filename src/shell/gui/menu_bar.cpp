@@ -37,7 +37,8 @@ void song_items(Program& p, const CommandInfo& c) {
         std::string label = name[0] ? name : c.label;
         if (p.song_dirty(s)) label += " *";
         ImGui::PushID(s);
-        if (ImGui::MenuItem(label.c_str(), nullptr, s == bank.noimod)) p.post(c.code + static_cast<uint32_t>(s));
+        if (ImGui::MenuItem(label.c_str(), nullptr, s == bank.noimod))
+            p.post(c.code + static_cast<uint32_t>(s));
         ImGui::PopID();
     }
 }

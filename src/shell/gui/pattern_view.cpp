@@ -41,7 +41,8 @@ void PatternView::place_view(Program& p, int rows, int tracks) {
     const bool following = tr.playing && !tr.fplaytrack && p.editor.follow_song;
     const int focus = following ? int(tr.nopos) : int(p.engine.player.cursor.poscurv);
     // The focused row stays in the middle, as in the trackers composers know.
-    view_top_ = std::clamp(focus - visible_rows_ / 2, -visible_rows_ / 2, std::max(0, rows - 1 - visible_rows_ / 2));
+    view_top_ =
+        std::clamp(focus - visible_rows_ / 2, -visible_rows_ / 2, std::max(0, rows - 1 - visible_rows_ / 2));
     p.editor.view_top = static_cast<int16_t>(std::max(0, view_top_));
 
     const int cursor_track = p.engine.player.cursor.track;
@@ -64,9 +65,11 @@ void PatternView::draw_headers(Program& p, ImDrawList* dl, ImVec2 origin, int tr
         char label[32];
         std::snprintf(label, sizeof label, "Track %02d%s", t + 1, muted ? "  MUTED" : "");
         dl->AddText(ImVec2(a.x + 4, a.y + 2), muted ? kMuted : kNote, label);
-        const float level = std::clamp(tr.valvu[size_t(t)].load(std::memory_order_relaxed) / 128.0f, 0.0f, 1.0f);
+        const float level =
+            std::clamp(tr.valvu[size_t(t)].load(std::memory_order_relaxed) / 128.0f, 0.0f, 1.0f);
         if (p.engine.player.tr.fvuvu && level > 0)
-            dl->AddRectFilled(ImVec2(a.x + 4, b.y - 7), ImVec2(a.x + 4 + (track_w_ - 12) * level, b.y - 3), kMeter);
+            dl->AddRectFilled(ImVec2(a.x + 4, b.y - 7), ImVec2(a.x + 4 + (track_w_ - 12) * level, b.y - 3),
+                              kMeter);
         ImGui::SetCursorScreenPos(a);
         ImGui::PushID(t);
         if (ImGui::InvisibleButton("##header", ImVec2(track_w_ - 4, header_h_ - 4)))
@@ -91,7 +94,8 @@ void PatternView::handle_mouse(Program& p, ImVec2 origin, int rows) {
     const int track = p.editor.oftrack + column;
     const int x = int((m.x - origin.x - number_w_ - column * track_w_ - 4) / char_w_);
     if (row < 0 || row >= rows) return;
-    p.post(ShellMessage(fourcc("CUto")).with("row", row).with("track", track).with("field", field_at_column(x)));
+    p.post(
+        ShellMessage(fourcc("CUto")).with("row", row).with("track", track).with("field", field_at_column(x)));
 }
 
 void PatternView::draw(Program& p, const TMOD& song, ImVec2 size) {
@@ -141,7 +145,8 @@ void PatternView::draw(Program& p, const TMOD& song, ImVec2 size) {
             if (t == cursor.track && r == cursor.poscurv) {
                 const int field = cursor.poscurx % kFieldsPerTrack;
                 const float fx = x + field_column(field) * char_w_;
-                dl->AddRectFilled(ImVec2(fx - 1, y), ImVec2(fx + field_width(field) * char_w_ + 1, y + row_h_),
+                dl->AddRectFilled(ImVec2(fx - 1, y),
+                                  ImVec2(fx + field_width(field) * char_w_ + 1, y + row_h_),
                                   p.editor.edit_mode ? kCursorEdit : kCursorView);
             }
             const auto put = [&](int column, const char* s, ImU32 colour) {

@@ -18,8 +18,10 @@ void draw_status_line(Program& p, float top, float height) {
                  ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove | ImGuiWindowFlags_NoSavedSettings);
     ImGui::TextUnformatted(p.engine.player.status);
     ImGui::SameLine(0, 20);
-    if (p.editor.edit_mode) ImGui::TextColored(ImVec4(1.0f, 0.4f, 0.4f, 1), "EDIT MODE");
-    else ImGui::TextDisabled("edit mode off (Space)");
+    if (p.editor.edit_mode)
+        ImGui::TextColored(ImVec4(1.0f, 0.4f, 0.4f, 1), "EDIT MODE");
+    else
+        ImGui::TextDisabled("edit mode off (Space)");
     ImGui::SameLine(0, 20);
     if (!p.audio_status.empty()) {
         ImGui::TextColored(ImVec4(1.0f, 0.7f, 0.3f, 1), "%s", p.audio_status.c_str());

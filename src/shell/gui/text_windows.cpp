@@ -42,7 +42,8 @@ void text_window(const char* title, bool& open, const char* text, ImVec2 size) {
     if (!open) return;
     ImGui::SetNextWindowSize(size, ImGuiCond_Appearing);
     const ImGuiViewport* view = ImGui::GetMainViewport();
-    ImGui::SetNextWindowPos(ImVec2(view->Size.x / 2, view->Size.y / 2), ImGuiCond_Appearing, ImVec2(0.5f, 0.5f));
+    ImGui::SetNextWindowPos(ImVec2(view->Size.x / 2, view->Size.y / 2), ImGuiCond_Appearing,
+                            ImVec2(0.5f, 0.5f));
     if (ImGui::Begin(title, &open, ImGuiWindowFlags_NoSavedSettings)) show_document(text);
     ImGui::End();
 }

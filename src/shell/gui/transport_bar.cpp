@@ -54,8 +54,8 @@ float draw_transport_bar(Program& p, const TMOD& song, float top) {
 
     const int position = std::clamp<int>(tr.nopat, 0, kPositions - 1);
     const double seconds = playing ? double(system_time_us() - uint64_t(tr.startplaying.load())) / 1e6 : 0.0;
-    ImGui::Text("Pos %03d/%03d  Pattern %03d  Row %03d  Time %02d:%02d", position, song.nbpos, song.sequence[position],
-                int(tr.nopos), int(seconds) / 60, int(seconds) % 60);
+    ImGui::Text("Pos %03d/%03d  Pattern %03d  Row %03d  Time %02d:%02d", position, song.nbpos,
+                song.sequence[position], int(tr.nopos), int(seconds) / 60, int(seconds) % 60);
     ImGui::SameLine(0, 24);
     ImGui::Text("BPM %u  Speed %d", song.tempo ? 60000000u / song.tempo : 0u, int(song.speed));
     ImGui::SameLine(0, 24);
@@ -66,8 +66,8 @@ float draw_transport_bar(Program& p, const TMOD& song, float top) {
 
     const int instrument = player.cursor.cursnd + 1;
     const p_s* sound = p.engine.bank.song_sample(instrument - 1);
-    ImGui::Text("Octave %d  Step %d  Instrument %02d %s", p.editor.octave, int(player.cursor.jumpstep), instrument,
-                sound ? sound->name : "(empty)");
+    ImGui::Text("Octave %d  Step %d  Instrument %02d %s", p.editor.octave, int(player.cursor.jumpstep),
+                instrument, sound ? sound->name : "(empty)");
     ImGui::SameLine(0, 24);
     ImGui::Text("Song \"%s\"  %d tracks", song.name[0] ? song.name : "No name", int(song.nbtrack));
     ImGui::End();

@@ -1,0 +1,141 @@
+// The menu commands: each code with its exact label and shortcut, in menu order, and each
+// reaching a handler.
+#include "shell/command_table.h"
+
+#include <gtest/gtest.h>
+
+namespace ondrel {
+namespace {
+
+struct Expected {
+    const char* code;
+    const char* label;
+    KeyChord shortcut;
+};
+
+// The main window's menu commands, in menu order.
+const Expected kMenuCommands[] = {
+    {"news", "New Song", {}},
+    {"OPen", "Open Song", ctrl('o')},
+    {"SAve", "Save Song", ctrl('s')},
+    {"SAva", "Save as...", ctrl_shift('s')},
+    {"SAvm", "Save as Midifile", {}},
+    {"SAvs", "Save Sound", {}},
+    {"abou", "About Ondrel Tracker...", {}},
+    {"_QRQ", "Quit", ctrl('q')},
+    {"Pclr", "Pattern Clear", {}},
+    {"Pcut", "Pattern Cut", ctrl('x')},
+    {"Pcpy", "Pattern Copy", {}},
+    {"Ppas", "Pattern Paste", ctrl('v')},
+    {"Tclr", "Track Clear", {}},
+    {"Tcut", "Track Cut", ctrl_shift('x')},
+    {"Tcpy", "Track Copy", {}},
+    {"Tpas", "Track Paste", ctrl_shift('v')},
+    {"Tplu", "Next Pos", {}},
+    {"Tmoi", "Prev Pos", {}},
+    {"Tdel", "Pos Delete", {}},
+    {"Tins", "Pos Insert", {}},
+    {"Tnpt", "New Pattern", {}},
+    {"Tppt", "Next position & New Pattern", {}},
+    {"Trpt", "Remove Pattern", {}},
+    {"J001", "Jump 1 line", ctrl('1')},
+    {"J002", "Jump 2 lines", ctrl('2')},
+    {"J003", "Jump 3 lines", ctrl('3')},
+    {"J004", "Jump 4 lines", ctrl('4')},
+    {"J005", "Jump 5 lines", ctrl('5')},
+    {"J006", "Jump 6 lines", ctrl('6')},
+    {"J007", "Jump 7 lines", ctrl('7')},
+    {"J008", "Jump 8 lines", ctrl('8')},
+    {"Rsnd", "Remove Sounds", {}},
+    {"Rseq", "Remove Sequence", {}},
+    {"Rall", "Remove All", {}},
+    {"FIIT", "Find instruments not used in the music", {}},
+    {"CUIT", "Find current instrument", {}},
+    {"wmed", "Documentation", {}},
+    {"itli", "Instrument List", {}},
+    {"arra", "Arrangement", {}},
+    {"wfft", "FFT Window", {}},
+    {"MulL", "Multiple Music Loading", {}},
+    {"kiLL", "Kill current Music", {}},
+    {"NEWM", "New Music", {}},
+    {"ZI00", "No name", {}},
+    {"GOte", "Tempo", {}},
+    {"Mfil", "File Mode", {}},
+    {"Mami", "Amiga Mode", {}},
+    {"Mler", "L&R Mode", {}},
+    {"Mpan", "Panoramic Mode", {}},
+    {"Mnor", "Normal", {}},
+    {"Mint", "Interpolation", {}},
+    {"full", "Full Screen", {}},
+    {"vuvu", "Vumeter", {}},
+    {"accd", "Accord Edit", {}},
+    {"ATRI", "Atari", {}},
+    {"AMIG", "Amiga", {}},
+};
+
+// The other menus: the file browser's, the envelope selector, the analyser's.
+const Expected kOtherMenus[] = {
+    {"GO00", "Add Path To music", {}},
+    {"GO01", "Add Path To sound", {}},
+    {"GO02", "Remove path", {}},
+    {"seea", "See All Files", {}},
+    {"seed", "See All Directory", {}},
+    {"see1", "See Directory with audio sound level 1", {}},
+    {"seeA", "See Directory with audio sound all levels", {}},
+    {"find", "Find all audio files", {}},
+    {"NDMN", "Refresh", {}},
+    {"co00", "Velocity", {}},
+    {"co01", "Efx Env", {}},
+    {"co02", "Panoramic", {}},
+    {"co03", "Coarse tune", {}},
+    {"co04", "Velocity off", {}},
+    {"FFTs", "Song", {}},
+    {"FFTi", "Input", {}},
+    {"FTv0", "Classic", {}},
+    {"FTv1", "Radar", {}},
+};
+
+uint32_t code_of(const char* text) {
+    return uint32_t(uint8_t(text[0])) << 24 | uint32_t(uint8_t(text[1])) << 16 |
+           uint32_t(uint8_t(text[2])) << 8 | uint32_t(uint8_t(text[3]));
+}
+
+size_t table_index(const CommandInfo* c) {
+    return static_cast<size_t>(c - command_table().data());
+}
+
+TEST(CommandTable, EveryMenuCommandHasItsLabelAndShortcutInMenuOrder) {
+    size_t last = 0;
+    for (const Expected& e : kMenuCommands) {
+        SCOPED_TRACE(e.code);
+        const CommandInfo* c = find_command(code_of(e.code));
+        ASSERT_NE(c, nullptr);
+        EXPECT_STREQ(c->label, e.label);
+        EXPECT_EQ(c->shortcut, e.shortcut);
+        EXPECT_NE(c->menu, Menu::None);
+        EXPECT_GE(table_index(c), last) << "out of menu order";
+        last = table_index(c);
+    }
+    for (const Expected& e : kOtherMenus) {
+        SCOPED_TRACE(e.code);
+        const CommandInfo* c = find_command(code_of(e.code));
+        ASSERT_NE(c, nullptr);
+        EXPECT_STREQ(c->label, e.label);
+    }
+}
+
+TEST(CommandTable, ShortcutsAreUniqueAndFindTheirCommand) {
+    for (const CommandInfo& c : command_table()) {
+        if (c.shortcut.empty()) continue;
+        SCOPED_TRACE(c.label);
+        EXPECT_EQ(command_for_shortcut(c.shortcut), &c);
+    }
+}
+
+TEST(CommandTable, TheSongMenuCoversEverySongSlot) {
+    EXPECT_EQ(find_command(code_of("ZI00") + 62), find_command(code_of("ZI00")));
+    EXPECT_EQ(find_command(code_of("ZI00") + 63), nullptr);
+}
+
+}  // namespace
+}  // namespace ondrel

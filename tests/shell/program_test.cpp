@@ -1,0 +1,184 @@
+// The program driven through its command queue, as the window, keys and drops drive it.
+#include "shell/program.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+
+#include "support/temp_dir.h"
+
+namespace ondrel {
+namespace {
+
+const std::string kModule = "../shared/corpus/mod/TDZ3.MOD";
+const std::string kSound = "../shared/corpus/sound/blip.wav";
+
+class ProgramTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        for (const auto& f : {kModule, kSound})
+            if (!std::filesystem::exists(f)) GTEST_SKIP() << f << " is missing";
+    }
+    void open(const std::vector<std::string>& paths) {
+        ShellMessage m(fourcc("refs"));
+        m.refs = paths;
+        p.post(m);
+        p.run_pending();
+    }
+    void run(const char (&code)[5]) {
+        p.post(fourcc(code));
+        p.run_pending();
+    }
+    // A cell change the way an editor command makes one.
+    void change_a_cell() {
+        p.edit("cell", [](SongTransaction& t) { t.pattern(t.live().sequence[0])->col[0][0].note = 49; });
+    }
+    std::string front_text() const { return p.alerts.front() ? p.alerts.front()->text : ""; }
+
+    Program p;
+    test::TempDir dir;
+};
+
+TEST_F(ProgramTest, OpensModulesSoundsAndRefusesTheRest) {
+    open({kModule});
+    EXPECT_EQ(p.engine.bank.nbimod, 1);
+    EXPECT_EQ(std::string(p.engine.bank.current().path), kModule);
+    EXPECT_FALSE(p.history().dirty());
+
+    p.engine.player.cursor.cursnd = 100;
+    open({kSound});
+    const p_s* sound = p.engine.bank.song_sample(100);
+    ASSERT_NE(sound, nullptr);
+    EXPECT_EQ(sound->rate, 16000u);
+    EXPECT_TRUE(p.history().dirty());  // a sound put in is an edit, and undone like one
+    run("UNDO");
+    EXPECT_EQ(p.engine.bank.song_sample(100), nullptr);
+
+    open({dir.write("notes.txt", {'h', 'i'})});
+    EXPECT_EQ(front_text(), "I don't use this file");
+    EXPECT_EQ(p.alerts.front()->buttons, std::vector<std::string>{"oops !!"});
+    p.alerts.answer(0);
+
+    // A module that cannot be read leaves the song as it was and says why.
+    open({dir.write("broken.mod", std::vector<uint8_t>(100, 7))});
+    EXPECT_EQ(std::string(p.engine.bank.current().path), kModule);
+    EXPECT_FALSE(p.alerts.empty());
+}
+
+TEST_F(ProgramTest, MultipleMusicLoadingAddsSongsThatCanBeChosenAndKilled) {
+    run("MulL");
+    open({kModule, kModule});
+    EXPECT_EQ(p.engine.bank.nbimod, 3);
+    EXPECT_EQ(p.engine.bank.noimod, 2);
+    p.post(fourcc("ZI00") + 1);
+    p.run_pending();
+    EXPECT_EQ(p.engine.bank.noimod, 1);
+    run("kiLL");
+    EXPECT_EQ(p.engine.bank.nbimod, 2);
+    run("NEWM");
+    EXPECT_EQ(p.engine.bank.nbimod, 3);
+    EXPECT_STREQ(p.engine.bank.current().name, "");
+}
+
+TEST_F(ProgramTest, SavingAForeignSongAsksForANativeFileAndKeepsTheOriginal) {
+    open({kModule});
+    const auto original = test::read_all(kModule);
+    run("SAve");
+    ASSERT_TRUE(p.file_panel.open());
+    EXPECT_EQ(p.file_panel.suggested_name, "TDZ3.otm");
+    p.file_chosen(dir.file("copy"));
+    p.run_pending();
+    EXPECT_EQ(test::read_all(kModule), original);
+    EXPECT_EQ(std::string(p.engine.bank.current().path), dir.file("copy.otm"));
+    EXPECT_FALSE(p.history().dirty());
+
+    // From now on "Save Song" writes the native file in place, without asking.
+    change_a_cell();
+    run("SAve");
+    EXPECT_FALSE(p.file_panel.open());
+    EXPECT_FALSE(p.history().dirty());
+    Program again;
+    ShellMessage m(fourcc("refs"));
+    m.refs = {dir.file("copy.otm")};
+    again.post(m);
+    again.run_pending();
+    EXPECT_EQ(again.engine.bank.song_pattern(again.engine.bank.current().sequence[0])->col[0][0].note, 49);
+}
+
+TEST_F(ProgramTest, UnsavedChangesAreAskedAboutBeforeTheyAreLost) {
+    change_a_cell();
+    run("news");
+    ASSERT_EQ(p.alerts.size(), 1u);
+    p.alerts.answer(kAnswerCancel);
+    EXPECT_TRUE(p.history().dirty());
+    run("news");
+    p.alerts.answer(kAnswerDontSave);
+    EXPECT_FALSE(p.history().dirty());
+    EXPECT_EQ(p.engine.bank.song_pattern(0)->col[0][0].note, 0);
+
+    // Quitting asks too, and "Cancel" keeps the program running.
+    bool quit_work_done = false;
+    p.on_quit = [&] { quit_work_done = true; };
+    change_a_cell();
+    run("_QRQ");
+    EXPECT_EQ(p.quit_state(), Program::QuitState::Asking);
+    p.alerts.answer(kAnswerCancel);
+    EXPECT_EQ(p.quit_state(), Program::QuitState::Running);
+    run("_QRQ");
+    p.alerts.answer(kAnswerDontSave);
+    EXPECT_EQ(p.quit_state(), Program::QuitState::Done);
+    EXPECT_TRUE(quit_work_done);
+}
+
+TEST_F(ProgramTest, KeysReachTheTransportTheOptionsAndTheCursor) {
+    open({kModule});
+    p.key_down(plain(kKeyF1 + 4));  // F5
+    p.run_pending();
+    EXPECT_EQ(p.engine.player.tr.playing, 1);
+    p.key_down(plain(kKeyF1 + 7));  // F8
+    p.run_pending();
+    EXPECT_EQ(p.engine.player.tr.playing, 0);
+    p.key_down(ctrl('3'));
+    p.run_pending();
+    EXPECT_EQ(p.engine.player.cursor.jumpstep, 3);
+    p.key_down(plain(kKeyUp));  // from row 0 up wraps to the pattern's last row
+    EXPECT_EQ(p.engine.player.cursor.poscurv,
+              p.engine.bank.current().rows[p.engine.bank.current().sequence[0]] - 1);
+    p.key_down(plain(kKeyTab));
+    EXPECT_EQ(p.engine.player.cursor.track, 1);
+    p.key_down(plain(kKeySpace));
+    p.run_pending();
+    EXPECT_TRUE(p.editor.edit_mode);
+}
+
+TEST_F(ProgramTest, OptionTogglesShowTheirState) {
+    struct Toggle {
+        const char* code;
+        bool (*on)(const Program&);
+    };
+    const Toggle toggles[] = {
+        {"GOte", [](const Program& q) { return q.engine.mixer.ftemp != 0; }},
+        {"vuvu", [](const Program& q) { return q.engine.player.tr.fvuvu != 0; }},
+        {"accd", [](const Program& q) { return q.engine.player.tr.faccedit != 0; }},
+        {"MulL", [](const Program& q) { return q.engine.bank.fmulload != 0; }},
+        {"full", [](const Program& q) { return q.windows.full_screen; }},
+    };
+    for (const Toggle& t : toggles) {
+        SCOPED_TRACE(t.code);
+        const bool before = t.on(p);
+        p.post(fourcc(*reinterpret_cast<const char(*)[5]>(t.code)));
+        p.run_pending();
+        EXPECT_NE(t.on(p), before);
+    }
+    run("Mami");
+    EXPECT_EQ(p.engine.bank.current().mode, 1);
+    run("Mler");
+    EXPECT_EQ(p.engine.bank.current().mode, 3);
+    run("Mint");
+    EXPECT_EQ(p.engine.mixer.qual, 1);
+    run("ATRI");
+    EXPECT_EQ(p.editor.layout, KeyboardLayout::Atari);
+}
+
+}  // namespace
+}  // namespace ondrel
