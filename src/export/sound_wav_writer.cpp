@@ -1,6 +1,6 @@
 #include "export/sound_wav_writer.h"
 
-#include "export/atomic_file.h"
+#include "export/output_file.h"
 #include "export/byte_writer.h"
 
 namespace ondrel {
@@ -33,7 +33,7 @@ std::vector<uint8_t> sound_to_wav(const p_s& sound) {
 }
 
 bool save_sound_wav(const std::string& path, const p_s& sound, std::string& why) {
-    return write_file_atomically(path, sound_to_wav(sound), why);
+    return write_output_file(path, sound_to_wav(sound), why);
 }
 
 }  // namespace ondrel
