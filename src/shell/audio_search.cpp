@@ -1,0 +1,124 @@
+#include "shell/audio_search.h"
+
+#include <pthread.h>
+#include <sys/resource.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <filesystem>
+
+namespace ondrel {
+
+namespace fs = std::filesystem;
+
+AudioSearch::~AudioSearch() {
+    stop_worker();
+}
+
+void AudioSearch::stop_worker() {
+    cancel_.store(true, std::memory_order_relaxed);
+    if (worker_.joinable()) worker_.join();
+}
+
+void AudioSearch::start(const std::string& root) {
+    stop_worker();
+    root_ = root;
+    cancel_.store(false, std::memory_order_relaxed);
+    directories_ = 0;
+    files_ = 0;
+    found_ = 0;
+    {
+        std::lock_guard lock(mutex_);
+        ready_.clear();
+        current_ = root;
+    }
+    running_.store(true, std::memory_order_release);
+    worker_ = std::thread(&AudioSearch::walk, this, root);
+}
+
+void AudioSearch::cancel() {
+    cancel_.store(true, std::memory_order_relaxed);
+}
+
+SearchProgress AudioSearch::progress() const {
+    SearchProgress p;
+    p.running = running();
+    p.cancelled = cancel_.load(std::memory_order_relaxed);
+    p.directories = directories_.load(std::memory_order_relaxed);
+    p.files = files_.load(std::memory_order_relaxed);
+    p.found = found_.load(std::memory_order_relaxed);
+    std::lock_guard lock(mutex_);
+    p.current = current_;
+    return p;
+}
+
+size_t AudioSearch::take_results(std::vector<BrowserEntry>& out) {
+    std::vector<BrowserEntry> taken;
+    {
+        std::lock_guard lock(mutex_);
+        taken.swap(ready_);
+    }
+    out.insert(out.end(), std::make_move_iterator(taken.begin()), std::make_move_iterator(taken.end()));
+    return taken.size();
+}
+
+void AudioSearch::publish(std::vector<BrowserEntry>& batch) {
+    if (batch.empty()) return;
+    std::sort(batch.begin(), batch.end(), browser_order);
+    found_.fetch_add(batch.size(), std::memory_order_relaxed);
+    std::lock_guard lock(mutex_);
+    ready_.insert(ready_.end(), std::make_move_iterator(batch.begin()), std::make_move_iterator(batch.end()));
+    batch.clear();
+}
+
+void AudioSearch::walk(std::string root) {
+    pthread_setname_np(pthread_self(), "find_audio");
+    // Sniffing content is disk and CPU work nobody waits for: let drawing and sound go first.
+    setpriority(PRIO_PROCESS, static_cast<id_t>(gettid()), 10);
+
+    std::vector<fs::path> pending{fs::path(root)};
+    std::vector<BrowserEntry> batch;
+    const auto cancelled = [&] { return cancel_.load(std::memory_order_relaxed); };
+    while (!pending.empty() && !cancelled()) {
+        const fs::path dir = std::move(pending.back());
+        pending.pop_back();
+        {
+            std::lock_guard lock(mutex_);
+            current_ = dir.string();
+        }
+        std::error_code ec;
+        fs::directory_iterator it(dir, fs::directory_options::skip_permission_denied, ec);
+        std::vector<fs::path> subdirectories;
+        for (; !ec && it != fs::directory_iterator() && !cancelled(); it.increment(ec)) {
+            const fs::directory_entry& entry = *it;
+            const std::string name = entry.path().filename().string();
+            std::error_code kind_ec;
+            if (entry.is_directory(kind_ec)) {
+                if (!is_hidden_name(name) && !entry.is_symlink(kind_ec))
+                    subdirectories.push_back(entry.path());
+                continue;
+            }
+            if (!entry.is_regular_file(kind_ec)) continue;
+            files_.fetch_add(1, std::memory_order_relaxed);
+            const std::string path = entry.path().string();
+            const EntryKind kind = kind_of_file(path);
+            if (is_audio(kind)) batch.push_back({entry.path().lexically_relative(root).string(), path, kind});
+        }
+        directories_.fetch_add(1, std::memory_order_relaxed);
+        publish(batch);
+        // Depth first, the subdirectories in name order.
+        std::sort(subdirectories.begin(), subdirectories.end(), [](const fs::path& a, const fs::path& b) {
+            return browser_order({a.filename().string(), "", EntryKind::Directory},
+                                 {b.filename().string(), "", EntryKind::Directory});
+        });
+        pending.insert(pending.end(), std::make_move_iterator(subdirectories.rbegin()),
+                       std::make_move_iterator(subdirectories.rend()));
+    }
+    {
+        std::lock_guard lock(mutex_);
+        current_.clear();
+    }
+    running_.store(false, std::memory_order_release);
+}
+
+}  // namespace ondrel
