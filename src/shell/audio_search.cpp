@@ -1,9 +1,5 @@
 #include "shell/audio_search.h"
 
-#include <pthread.h>
-#include <sys/resource.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <filesystem>
 
@@ -11,19 +7,9 @@ namespace ondrel {
 
 namespace fs = std::filesystem;
 
-AudioSearch::~AudioSearch() {
-    stop_worker();
-}
-
-void AudioSearch::stop_worker() {
-    cancel_.store(true, std::memory_order_relaxed);
-    if (worker_.joinable()) worker_.join();
-}
-
 void AudioSearch::start(const std::string& root) {
-    stop_worker();
+    worker_.stop();
     root_ = root;
-    cancel_.store(false, std::memory_order_relaxed);
     directories_ = 0;
     files_ = 0;
     found_ = 0;
@@ -33,17 +19,13 @@ void AudioSearch::start(const std::string& root) {
         current_ = root;
     }
     running_.store(true, std::memory_order_release);
-    worker_ = std::thread(&AudioSearch::walk, this, root);
-}
-
-void AudioSearch::cancel() {
-    cancel_.store(true, std::memory_order_relaxed);
+    worker_.start("find_audio", [this, root](const std::atomic<bool>& stop) { walk(root, stop); });
 }
 
 SearchProgress AudioSearch::progress() const {
     SearchProgress p;
     p.running = running();
-    p.cancelled = cancel_.load(std::memory_order_relaxed);
+    p.cancelled = worker_.stop_requested();
     p.directories = directories_.load(std::memory_order_relaxed);
     p.files = files_.load(std::memory_order_relaxed);
     p.found = found_.load(std::memory_order_relaxed);
@@ -71,14 +53,10 @@ void AudioSearch::publish(std::vector<BrowserEntry>& batch) {
     batch.clear();
 }
 
-void AudioSearch::walk(std::string root) {
-    pthread_setname_np(pthread_self(), "find_audio");
-    // Sniffing content is disk and CPU work nobody waits for: let drawing and sound go first.
-    setpriority(PRIO_PROCESS, static_cast<id_t>(gettid()), 10);
-
+void AudioSearch::walk(const std::string& root, const std::atomic<bool>& stop) {
     std::vector<fs::path> pending{fs::path(root)};
     std::vector<BrowserEntry> batch;
-    const auto cancelled = [&] { return cancel_.load(std::memory_order_relaxed); };
+    const auto cancelled = [&] { return stop.load(std::memory_order_relaxed); };
     while (!pending.empty() && !cancelled()) {
         const fs::path dir = std::move(pending.back());
         pending.pop_back();

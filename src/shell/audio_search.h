@@ -3,9 +3,9 @@
 #include <cstdint>
 #include <mutex>
 #include <string>
-#include <thread>
 #include <vector>
 
+#include "shell/background_thread.h"
 #include "shell/browser_entry.h"
 
 namespace ondrel {
@@ -26,15 +26,10 @@ struct SearchProgress {
 // symbolic links to directories are not walked; unreadable ones are passed over.
 class AudioSearch {
 public:
-    AudioSearch() = default;
-    ~AudioSearch();
-    AudioSearch(const AudioSearch&) = delete;
-    AudioSearch& operator=(const AudioSearch&) = delete;
-
     // Starts a search of root, ending the one under way; earlier results are dropped.
     void start(const std::string& root);
     // Asks the search to stop; it ends after the file it is reading.
-    void cancel();
+    void cancel() { worker_.request_stop(); }
     bool running() const { return running_.load(std::memory_order_acquire); }
     SearchProgress progress() const;
     // Appends what was found since the last call to out; the number appended. Each
@@ -43,20 +38,18 @@ public:
     const std::string& root() const { return root_; }
 
 private:
-    void stop_worker();
-    void walk(std::string root);
+    void walk(const std::string& root, const std::atomic<bool>& stop);
     void publish(std::vector<BrowserEntry>& batch);
 
-    std::thread worker_;
     std::string root_;
     std::atomic<bool> running_{false};
-    std::atomic<bool> cancel_{false};
     std::atomic<uint64_t> directories_{0};
     std::atomic<uint64_t> files_{0};
     std::atomic<uint64_t> found_{0};
     mutable std::mutex mutex_;  // guards the two below
     std::vector<BrowserEntry> ready_;
     std::string current_;
+    BackgroundThread worker_;  // last: stopped before the members it uses go
 };
 
 }  // namespace ondrel

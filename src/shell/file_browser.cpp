@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <utility>
 
 #include "playback/messages.h"
 
@@ -16,9 +17,14 @@ struct AudioLookBudget {
     size_t sniffs = 2000;
 };
 
+bool stopped(const std::atomic<bool>* stop) {
+    return stop && stop->load(std::memory_order_relaxed);
+}
+
 // Whether dir holds a module or sound, directly or (all_levels) anywhere below it. Names
 // decide first over the whole tree; content is sniffed only for the files left unsure.
-bool holds_audio(const fs::path& dir, bool all_levels, AudioLookBudget& budget) {
+bool holds_audio(const fs::path& dir, bool all_levels, AudioLookBudget& budget,
+                 const std::atomic<bool>* stop) {
     std::vector<fs::path> pending{dir};
     std::vector<std::string> unsure;
     while (!pending.empty()) {
@@ -27,7 +33,7 @@ bool holds_audio(const fs::path& dir, bool all_levels, AudioLookBudget& budget) 
         std::error_code ec;
         fs::directory_iterator it(current, fs::directory_options::skip_permission_denied, ec);
         for (; !ec && it != fs::directory_iterator(); it.increment(ec)) {
-            if (budget.entries == 0) return true;
+            if (budget.entries == 0 || stopped(stop)) return true;
             --budget.entries;
             const fs::directory_entry& entry = *it;
             std::error_code kind_ec;
@@ -44,7 +50,7 @@ bool holds_audio(const fs::path& dir, bool all_levels, AudioLookBudget& budget) 
         }
     }
     for (const std::string& path : unsure) {
-        if (budget.sniffs == 0) return true;
+        if (budget.sniffs == 0 || stopped(stop)) return true;
         --budget.sniffs;
         if (is_audio(kind_of_file(path))) return true;
     }
@@ -66,7 +72,8 @@ bool is_readable_directory(const fs::path& dir) {
 }
 }  // namespace
 
-bool list_directory(const std::string& where, const BrowserView& view, std::vector<BrowserEntry>& out) {
+bool list_directory(const std::string& where, const BrowserView& view, std::vector<BrowserEntry>& out,
+                    const std::atomic<bool>* stop) {
     out.clear();
     const fs::path dir = clean_directory(where);
     if (dir.empty()) return false;
@@ -75,6 +82,7 @@ bool list_directory(const std::string& where, const BrowserView& view, std::vect
     if (ec) return false;
     AudioLookBudget budget;
     for (; !ec && it != fs::directory_iterator(); it.increment(ec)) {
+        if (stopped(stop)) return false;
         const fs::directory_entry& entry = *it;
         std::string name = entry.path().filename().string();
         if (is_hidden_name(name) && !view.all_files) continue;
@@ -83,7 +91,7 @@ bool list_directory(const std::string& where, const BrowserView& view, std::vect
         if (entry.is_directory(kind_ec)) {
             const bool shown =
                 view.directories == DirectoryFilter::All ||
-                holds_audio(entry.path(), view.directories == DirectoryFilter::AudioAllLevels, budget);
+                holds_audio(entry.path(), view.directories == DirectoryFilter::AudioAllLevels, budget, stop);
             if (shown) out.push_back({std::move(name), std::move(path), EntryKind::Directory});
             continue;
         }
@@ -97,23 +105,50 @@ bool list_directory(const std::string& where, const BrowserView& view, std::vect
     return true;
 }
 
-FileBrowser::FileBrowser(const std::string& directory) : directory_(directory) {
+FileBrowser::FileBrowser(const std::string& directory) : directory_(clean_directory(directory).string()) {
+    requested_ = directory_;
     refresh();
 }
 
+void FileBrowser::start_listing(const std::string& dir) {
+    lister_.stop();  // a listing under way is dropped: it ends after the file it is reading
+    requested_ = dir;
+    loading_.store(true, std::memory_order_release);
+    lister_.start("list_dir", [this, dir, view = view_](const std::atomic<bool>& stop) {
+        std::vector<BrowserEntry> listed;
+        const bool ok = list_directory(dir, view, listed, &stop);
+        if (ok) {
+            std::lock_guard lock(mutex_);
+            finished_ = true;
+            finished_directory_ = dir;
+            finished_entries_ = std::move(listed);
+        }
+        // A directory that went away meanwhile leaves the last listing in place.
+        loading_.store(false, std::memory_order_release);
+    });
+}
+
+bool FileBrowser::update() {
+    std::lock_guard lock(mutex_);
+    if (!finished_) return false;
+    finished_ = false;
+    directory_ = std::move(finished_directory_);
+    entries_ = std::move(finished_entries_);
+    return true;
+}
+
 bool FileBrowser::open_directory(const std::string& dir) {
-    std::vector<BrowserEntry> listed;
-    if (!list_directory(dir, view_, listed)) return false;
-    directory_ = clean_directory(dir).string();
-    entries_ = std::move(listed);
+    const fs::path clean = clean_directory(dir);
+    if (clean.empty() || !is_readable_directory(clean)) return false;
+    start_listing(clean.string());
     return true;
 }
 
 void FileBrowser::refresh() {
-    fs::path dir = clean_directory(directory_);
+    fs::path dir = clean_directory(requested_);
     while (!is_readable_directory(dir) && dir.has_parent_path() && dir.parent_path() != dir)
         dir = dir.parent_path();
-    if (!open_directory(dir.string())) entries_.clear();
+    if (!dir.empty()) start_listing(dir.string());
 }
 
 bool FileBrowser::handle(uint32_t code) {

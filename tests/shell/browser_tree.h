@@ -1,6 +1,7 @@
 #pragma once
 // A directory tree of modules, sounds and other files for the browser and search tests.
 #include <filesystem>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -18,10 +19,11 @@ inline std::vector<uint8_t> wav_bytes() {
     return b.v;
 }
 
-// Makes the files (paths relative to the tree; a trailing '/' makes an empty directory).
-// Files called "disguised*" hold a WAV; the others hold text.
-inline void make_tree(const TempDir& dir, const std::vector<std::string>& files) {
-    for (const std::string& f : files) {
+// Makes the files, named relative to the tree and separated by spaces; a trailing '/'
+// makes an empty directory. Files called "disguised*" hold a WAV; the others hold text.
+inline void make_tree(const TempDir& dir, const std::string& names) {
+    std::istringstream in(names);
+    for (std::string f; in >> f;) {
         const std::filesystem::path path = dir.path() / f;
         if (f.back() == '/') {
             std::filesystem::create_directories(path);

@@ -10,101 +10,74 @@ namespace ondrel {
 namespace {
 
 using test::TempDir;
-using Dirs = std::vector<std::string>;
 
 std::string read_text(const std::string& path) {
     const auto bytes = test::read_all(path);
     return {bytes.begin(), bytes.end()};
 }
 
-void write_text(const TempDir& dir, const std::string& name, const std::string& text) {
-    dir.write(name, std::vector<uint8_t>(text.begin(), text.end()));
+void write_text(const TempDir& dir, const std::string& text) {
+    dir.write("ondrel.txt", std::vector<uint8_t>(text.begin(), text.end()));
 }
 
-// "@" in a case's text stands for a directory that exists.
-std::string with_existing(std::string text, const std::string& existing) {
-    for (size_t at = text.find('@'); at != std::string::npos; at = text.find('@', at + existing.size()))
-        text.replace(at, 1, existing);
-    return text;
+// "DIR | music... | sound..." with the temporary directory shown as "@".
+std::string summary(const PathSettings& s, const std::string& existing) {
+    std::string out = s.browser_directory == existing ? "@" : s.browser_directory;
+    out += " |";
+    for (const auto& d : s.music_directories()) out += " " + d;
+    out += " |";
+    for (const auto& d : s.sound_directories()) out += " " + d;
+    return out;
 }
-
-struct ReadCase {
-    const char* what;
-    std::string file;
-    bool browser_moves;  // to the existing directory
-    Dirs music;          // in menu order
-    Dirs sound;
-};
 
 TEST(PathFile, ReadsTheGrammarWithItsQuirks) {
-    const ReadCase cases[] = {
-        {"music reversed, sound in order",
-         "<Path>@\n<Music Path>/m/a\n<Music Path>/m/b\n<Music Path>/m/c\n"
-         "<Sound Path>/s/a\n<Sound Path>/s/b\n",
-         true,
-         {"/m/c", "/m/b", "/m/a"},
-         {"/s/a", "/s/b"}},
-        {"music after sound is not read",
-         "<Path>@\n<Music Path>/m/a\n<Sound Path>/s/a\n<Music Path>/m/b\n"
-         "<Sound Path>/s/b\n",
-         true,
-         {"/m/a"},
-         {"/s/a"}},
-        {"sound first ends the music group",
-         "<Path>@\n<Sound Path>/s/a\n<Music Path>/m/a\n",
-         true,
-         {},
-         {"/s/a"}},
-        {"a line without a key ends everything", "<Path>@\n# mine\n<Music Path>/m/a\n", true, {}, {}},
-        {"last line without its newline",
-         "<Path>@\n<Music Path>/m/a\n<Sound Path>/s/last",
-         true,
-         {"/m/a"},
-         {"/s/last"}},
-        {"vanished browser directory ignored",
-         "<Path>/no/such/ondrel/dir\n<Music Path>/gone/too\n",
-         false,
-         {"/gone/too"},
-         {}},
-        {"no <Path> line", "<Music Path>/m/a\n", false, {"/m/a"}, {}},
-        {"empty values skipped",
-         "<Path>@\n<Music Path>\n<Music Path>/m/a\n<Sound Path>\n",
-         true,
-         {"/m/a"},
-         {}},
-        {"empty file", "", false, {}, {}},
-        {"text after a NUL is never read",
-         std::string("<Path>@\n") + '\0' + "<Music Path>/m/a\n",
-         true,
-         {},
-         {}},
+    struct Case {
+        std::string file;  // "@" stands for a directory that exists
+        const char* expected;
     };
-    for (const ReadCase& c : cases) {
-        SCOPED_TRACE(c.what);
+    // clang-format off
+    const Case cases[] = {
+        // Music entries go in one ahead of the other; sound entries keep their order.
+        {"<Path>@\n<Music Path>/m/a\n<Music Path>/m/b\n<Music Path>/m/c\n<Sound Path>/s/a\n<Sound Path>/s/b\n",
+         "@ | /m/c /m/b /m/a | /s/a /s/b"},
+        // A line of the wrong group, or of none, ends the reading of its group.
+        {"<Path>@\n<Music Path>/m/a\n<Sound Path>/s/a\n<Music Path>/m/b\n<Sound Path>/s/b\n", "@ | /m/a | /s/a"},
+        {"<Path>@\n<Sound Path>/s/a\n<Music Path>/m/a\n", "@ | | /s/a"},
+        {"<Path>@\n# mine\n<Music Path>/m/a\n", "@ | |"},
+        {std::string("<Path>@\n") + '\0' + "<Music Path>/m/a\n", "@ | |"},
+        // The last line without its newline runs into the (zeroed) end of the block.
+        {"<Path>@\n<Music Path>/m/a\n<Sound Path>/s/last", "@ | /m/a | /s/last"},
+        // A vanished browser directory is ignored, favourites are not checked.
+        {"<Path>/no/such/ondrel/dir\n<Music Path>/gone/too\n", "/start | /gone/too |"},
+        {"<Music Path>/m/a\n", "/start | /m/a |"},
+        {"<Path>@\n<Music Path>\n<Music Path>/m/a\n<Sound Path>\n", "@ | /m/a |"},
+        {"", "/start | |"},
+    };
+    // clang-format on
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.file);
         TempDir dir;
         const std::string existing = dir.path().string();
-        write_text(dir, "ondrel.txt", with_existing(c.file, existing));
+        std::string text = c.file;
+        if (const size_t at = text.find('@'); at != std::string::npos) text.replace(at, 1, existing);
+        write_text(dir, text);
         PathSettings settings("/start");
         read_info_path(settings, existing);
-        EXPECT_EQ(settings.browser_directory, c.browser_moves ? existing : "/start");
-        EXPECT_EQ(settings.music_directories(), c.music);
-        EXPECT_EQ(settings.sound_directories(), c.sound);
+        EXPECT_EQ(summary(settings, existing), c.expected);
     }
 }
 
 TEST(PathFile, MissingOrUnreadableFileLeavesTheDefaults) {
     TempDir dir;
     PathSettings settings("/start");
-    const auto menu_before = settings.menu.size();
     read_info_path(settings, dir.file("absent"));
     std::filesystem::create_directory(dir.file("ondrel.txt"));  // a directory where the file should be
     read_info_path(settings, dir.path().string());
-    EXPECT_EQ(settings.browser_directory, "/start");
-    EXPECT_EQ(settings.menu.size(), menu_before);
-    EXPECT_EQ(settings.popadded, 0);
+    EXPECT_EQ(summary(settings, ""), "/start | |");
+    EXPECT_EQ(settings.menu.size(), 5u);
 }
 
-TEST(PathFile, WritesPathFirstAndTruncatesAnOlderList) {
+TEST(PathFile, WritesPathFirstTruncatesAndFlipsMusicAtEveryStart) {
     TempDir dir;
     const std::string thepath = dir.file("config/ondrel");  // created on first write
     PathSettings settings("/home/me/songs");
@@ -112,86 +85,68 @@ TEST(PathFile, WritesPathFirstAndTruncatesAnOlderList) {
     ASSERT_TRUE(write_info_path(settings, thepath, why)) << why;
     EXPECT_EQ(read_text(path_file_of(thepath)), "<Path>/home/me/songs\n");
 
-    settings.add_music_directory("/m/a");
-    settings.add_music_directory("/m/b");
-    settings.add_sound_directory("/s/a");
-    settings.add_sound_directory("/s/b");
+    for (const char* d : {"/m/1", "/m/2", "/m/3"}) settings.add_music_directory(d);
+    for (const char* d : {"/s/1", "/s/2", "/s/3"}) settings.add_sound_directory(d);
+    ASSERT_TRUE(write_info_path(settings, thepath, why)) << why;
+    const std::string sound = "<Sound Path>/s/1\n<Sound Path>/s/2\n<Sound Path>/s/3\n";
+    EXPECT_EQ(read_text(path_file_of(thepath)),
+              "<Path>/home/me/songs\n<Music Path>/m/3\n<Music Path>/m/2\n<Music Path>/m/1\n" + sound);
+
+    // Each start reads what the last one wrote.
+    for (const char* music : {"/m/1 /m/2 /m/3", "/m/3 /m/2 /m/1", "/m/1 /m/2 /m/3"}) {
+        PathSettings next("/start");
+        read_info_path(next, thepath);
+        EXPECT_EQ(summary(next, ""), std::string("/start | ") + music + " | /s/1 /s/2 /s/3");
+        ASSERT_TRUE(write_info_path(next, thepath, why)) << why;
+    }
+
+    ASSERT_TRUE(settings.remove_directory("/m/2"));
+    ASSERT_TRUE(settings.remove_directory("/s/1"));
     ASSERT_TRUE(write_info_path(settings, thepath, why)) << why;
     EXPECT_EQ(
         read_text(path_file_of(thepath)),
-        "<Path>/home/me/songs\n<Music Path>/m/b\n<Music Path>/m/a\n<Sound Path>/s/a\n<Sound Path>/s/b\n");
-
-    ASSERT_TRUE(settings.remove_directory("/m/b"));
-    ASSERT_TRUE(settings.remove_directory("/s/a"));
-    ASSERT_TRUE(write_info_path(settings, thepath, why)) << why;
-    EXPECT_EQ(read_text(path_file_of(thepath)), "<Path>/home/me/songs\n<Music Path>/m/a\n<Sound Path>/s/b\n");
-}
-
-TEST(PathFile, MusicOrderFlipsAtEveryStart) {
-    TempDir dir;
-    const std::string thepath = dir.path().string();
-    const std::string dirs =
-        "<Music Path>/m/1\n<Music Path>/m/2\n<Music Path>/m/3\n<Sound Path>/s/1\n"
-        "<Sound Path>/s/2\n";
-    write_text(dir, "ondrel.txt", "<Path>" + thepath + "\n" + dirs);
-    Dirs seen[3];
-    for (Dirs& music : seen) {  // three starts, each reading what the last one wrote
-        PathSettings settings("/start");
-        read_info_path(settings, thepath);
-        music = settings.music_directories();
-        EXPECT_EQ(settings.sound_directories(), (Dirs{"/s/1", "/s/2"}));
-        std::string why;
-        ASSERT_TRUE(write_info_path(settings, thepath, why)) << why;
-    }
-    EXPECT_EQ(seen[0], (Dirs{"/m/3", "/m/2", "/m/1"}));
-    EXPECT_EQ(seen[1], (Dirs{"/m/1", "/m/2", "/m/3"}));
-    EXPECT_EQ(seen[2], seen[0]);
+        "<Path>/home/me/songs\n<Music Path>/m/3\n<Music Path>/m/1\n<Sound Path>/s/2\n<Sound Path>/s/3\n");
 }
 
 TEST(PathsMenu, ItemsCarryCodesInAddingOrderAndAreToldApartByIndex) {
     TempDir dir;
-    const std::string here = dir.path().string();
-    std::filesystem::create_directory(dir.file("fav"));
-    PathSettings settings(here);
-    settings.add_music_directory(dir.file("fav"));  // first added: the same code as "Add Path To music"
+    const std::string fav = dir.file("fav");
+    std::filesystem::create_directory(fav);
+    PathSettings settings(dir.path().string());
+    settings.add_music_directory(fav);  // first added: the same code as "Add Path To music"
     settings.add_music_directory("/vanished/ondrel");
     settings.add_sound_directory("/s/a");
-    const std::vector<std::pair<std::string, uint32_t>> expected = {
-        {kAddMusicPathLabel, kAddMusicPathCode},
-        {kAddSoundPathLabel, kAddSoundPathCode},
-        {kRemovePathLabel, kRemovePathCode},
-        {"", 0},
-        {"/vanished/ondrel", kAddMusicPathCode + 1},
-        {dir.file("fav"), kAddMusicPathCode},
-        {"", 0},
-        {"/s/a", kAddMusicPathCode + 2}};
+    const std::vector<PathsMenuItem> expected = {{kAddMusicPathLabel, kAddMusicPathCode},
+                                                 {kAddSoundPathLabel, kAddSoundPathCode},
+                                                 {kRemovePathLabel, kRemovePathCode},
+                                                 {"", 0},
+                                                 {"/vanished/ondrel", kAddMusicPathCode + 1},
+                                                 {fav, kAddMusicPathCode},
+                                                 {"", 0},
+                                                 {"/s/a", kAddMusicPathCode + 2}};
     ASSERT_EQ(settings.menu.size(), expected.size());
     for (size_t i = 0; i < expected.size(); ++i) {
-        EXPECT_EQ(settings.menu[i].label, expected[i].first) << i;
-        EXPECT_EQ(settings.menu[i].code, expected[i].second) << i;
+        EXPECT_EQ(settings.menu[i].label, expected[i].label) << i;
+        EXPECT_EQ(settings.menu[i].code, expected[i].code) << i;
     }
 
-    // The favourite that shares 'GO00' opens its directory; it adds nothing.
+    // The favourite sharing 'GO00' opens its directory and adds nothing; a vanished one
+    // leaves the browser where it is.
     EXPECT_EQ(settings.choose(5), PathsChoice::OpenedDirectory);
-    EXPECT_EQ(settings.browser_directory, dir.file("fav"));
-    EXPECT_EQ(settings.menu.size(), expected.size());
     EXPECT_EQ(settings.choose(4), PathsChoice::MissingDirectory);
-    EXPECT_EQ(settings.browser_directory, dir.file("fav"));
-    for (size_t separator : {size_t{3}, size_t{6}, size_t{99}})
-        EXPECT_EQ(settings.choose(separator), PathsChoice::Nothing);
+    for (size_t separator : {3, 6, 99}) EXPECT_EQ(settings.choose(separator), PathsChoice::Nothing);
+    EXPECT_EQ(summary(settings, ""), fav + " | /vanished/ondrel " + fav + " | /s/a");
 
-    // "Remove path" then "Add Path To sound" act on the browser's directory; sound entries
-    // still land after the separator once a music entry has gone.
-    EXPECT_EQ(settings.choose(2), PathsChoice::RemovedDirectory);
-    EXPECT_EQ(settings.choose(2), PathsChoice::Nothing);
-    EXPECT_EQ(settings.choose(1), PathsChoice::AddedDirectory);
-    EXPECT_EQ(settings.choose(1), PathsChoice::Nothing);
-    EXPECT_EQ(settings.music_directories(), (Dirs{"/vanished/ondrel"}));
-    EXPECT_EQ(settings.sound_directories(), (Dirs{"/s/a", dir.file("fav")}));
-    EXPECT_EQ(settings.choose(0), PathsChoice::AddedDirectory);
-    EXPECT_EQ(settings.music_directories(), (Dirs{dir.file("fav"), "/vanished/ondrel"}));
+    // "Remove path", "Add Path To sound" and "Add Path To music" act on the browser's directory,
+    // once; sound entries still land last after a music entry has gone.
+    const std::pair<size_t, PathsChoice> clicks[] = {{2, PathsChoice::RemovedDirectory},
+                                                     {2, PathsChoice::Nothing},
+                                                     {1, PathsChoice::AddedDirectory},
+                                                     {1, PathsChoice::Nothing},
+                                                     {0, PathsChoice::AddedDirectory}};
+    for (const auto& [index, result] : clicks) EXPECT_EQ(settings.choose(index), result) << index;
+    EXPECT_EQ(summary(settings, ""), fav + " | " + fav + " /vanished/ondrel | /s/a " + fav);
     EXPECT_EQ(settings.menu[4].code, kAddMusicPathCode + 4);
-    EXPECT_EQ(settings.nopopsd, static_cast<int16_t>(settings.menu.size()));
 }
 
 }  // namespace

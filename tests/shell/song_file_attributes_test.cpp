@@ -9,67 +9,67 @@ namespace ondrel {
 namespace {
 
 using test::TempDir;
+using Bytes = std::vector<uint8_t>;
+
+struct Attribute {
+    const char* name;
+    int16_t EditorPosition::*field;
+    int16_t value;
+    Bytes on_disk;  // 32-bit little-endian, sign-extended
+};
+
+const Attribute kAttributes[] = {
+    {"user.on_nopat", &EditorPosition::nopat, 12, {12, 0, 0, 0}},
+    {"user.on_v", &EditorPosition::poscurv, -2, {0xFE, 0xFF, 0xFF, 0xFF}},
+    {"user.on_x", &EditorPosition::poscurx, 32767, {0xFF, 0x7F, 0, 0}},
+    {"user.on_y", &EditorPosition::scroll_y, -32768, {0x00, 0x80, 0xFF, 0xFF}},
+    {"user.oftrack", &EditorPosition::oftrack, 63, {63, 0, 0, 0}},
+};
 
 // A song file under /tmp, or a skip when that file system keeps no user attributes.
 class SongFileAttributes : public ::testing::Test {
 protected:
     void SetUp() override {
         path_ = dir_.write("song.otm", {1, 2, 3});
-        const uint8_t probe = 0;
-        if (!write_file_attribute(path_, "user.ondrel_probe", &probe, 1))
+        if (!write_file_attribute(path_, "user.ondrel_probe", "", 0))
             GTEST_SKIP() << "no user extended attributes on " << dir_.path();
-    }
-    std::vector<uint8_t> raw(const char* name) const {
-        uint8_t buf[16];
-        const long n = read_file_attribute(path_, name, buf, sizeof buf);
-        return n < 0 ? std::vector<uint8_t>{} : std::vector<uint8_t>(buf, buf + n);
     }
     TempDir dir_;
     std::string path_;
 };
 
 TEST_F(SongFileAttributes, RoundTripAsSignExtendedLittleEndian) {
-    const EditorPosition written{12, -2, 32767, -32768, 63};
+    EditorPosition written;
+    for (const Attribute& a : kAttributes) written.*a.field = a.value;
     writeinfo_in_file(path_, written);
-    EXPECT_EQ(raw("user.on_nopat"), (std::vector<uint8_t>{12, 0, 0, 0}));
-    EXPECT_EQ(raw("user.on_v"), (std::vector<uint8_t>{0xFE, 0xFF, 0xFF, 0xFF}));
-    EXPECT_EQ(raw("user.on_x"), (std::vector<uint8_t>{0xFF, 0x7F, 0, 0}));
-    EXPECT_EQ(raw("user.on_y"), (std::vector<uint8_t>{0x00, 0x80, 0xFF, 0xFF}));
-    EXPECT_EQ(raw("user.oftrack"), (std::vector<uint8_t>{63, 0, 0, 0}));
-
-    EditorPosition read{};
+    EditorPosition read;
     TMOD song{};
     set_text(song.path, path_.c_str());
     readinfo_in_file(song, read);
-    EXPECT_EQ(read.nopat, 12);
-    EXPECT_EQ(read.poscurv, -2);
-    EXPECT_EQ(read.poscurx, 32767);
-    EXPECT_EQ(read.scroll_y, -32768);
-    EXPECT_EQ(read.oftrack, 63);
+    for (const Attribute& a : kAttributes) {
+        uint8_t raw[16];
+        const long n = read_file_attribute(path_, a.name, raw, sizeof raw);
+        EXPECT_EQ(Bytes(raw, raw + std::max(n, 0L)), a.on_disk) << a.name;
+        EXPECT_EQ(read.*a.field, a.value) << a.name;
+    }
 }
 
 TEST_F(SongFileAttributes, OnlyExactlyFourBytesAreTaken) {
-    const uint8_t two[2] = {5, 0};
-    const uint8_t eight[8] = {6, 0, 0, 0, 0, 0, 0, 0};
-    const uint8_t four[4] = {7, 0, 0, 0};
-    write_file_attribute(path_, "user.on_nopat", two, sizeof two);
-    write_file_attribute(path_, "user.on_v", eight, sizeof eight);
-    write_file_attribute(path_, "user.on_x", four, sizeof four);
-    // "user.on_y" and "user.oftrack" are missing.
+    // Two bytes, eight bytes, four bytes, then two attributes missing.
+    const Bytes stored[] = {{5, 0}, {6, 0, 0, 0, 0, 0, 0, 0}, {7, 0, 0, 0}};
+    for (size_t i = 0; i < std::size(stored); ++i)
+        write_file_attribute(path_, kAttributes[i].name, stored[i].data(), stored[i].size());
     EditorPosition position{-1, -1, -1, -1, -1};
     readinfo_in_file(path_, position);
-    EXPECT_EQ(position.nopat, -1);
-    EXPECT_EQ(position.poscurv, -1);
-    EXPECT_EQ(position.poscurx, 7);
-    EXPECT_EQ(position.scroll_y, -1);
-    EXPECT_EQ(position.oftrack, -1);
+    const int16_t expected[] = {-1, -1, 7, -1, -1};
+    for (size_t i = 0; i < std::size(kAttributes); ++i)
+        EXPECT_EQ(position.*kAttributes[i].field, expected[i]) << kAttributes[i].name;
 }
 
 TEST(SongFileAttributesQuiet, MissingFileOrNoPathChangesNothing) {
     TempDir dir;
     EditorPosition position{1, 2, 3, 4, 5};
     writeinfo_in_file(dir.file("absent.otm"), position);
-    writeinfo_in_file(std::string(), position);
     readinfo_in_file(dir.file("absent.otm"), position);
     readinfo_in_file(TMOD{}, position);
     EXPECT_FALSE(std::filesystem::exists(dir.file("absent.otm")));
