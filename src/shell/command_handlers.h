@@ -23,6 +23,9 @@ void cmd_quit(Program& p, const ShellMessage& m);
 void save_song_then(Program& p, const std::function<void()>& next);
 // Songs with unsaved changes written where the next start finds them.
 void keep_recovery_copies(Program& p);
+// At start: asks, one copy at a time, whether to reopen what an earlier run kept ("Reopen"
+// loads it as an unsaved song under its original path, "Discard" drops it).
+void offer_recovery_copies(Program& p);
 
 // The editor's place kept on the song's file: read after a song is opened, written after
 // it is saved.

@@ -4,7 +4,7 @@
 #include <cstring>
 #include <filesystem>
 
-#include "export/atomic_file.h"
+#include "export/output_file.h"
 #include "import/loader.h"
 #include "import/sound_reader.h"
 
@@ -178,7 +178,7 @@ bool write_info_path(const PathSettings& settings, const std::string& thepath, s
         why = "cannot create " + thepath + ": " + ec.message();
         return false;
     }
-    return write_file_atomically(path_file_of(thepath), std::vector<uint8_t>(text.begin(), text.end()), why);
+    return write_output_file(path_file_of(thepath), std::vector<uint8_t>(text.begin(), text.end()), why);
 }
 
 }  // namespace ondrel

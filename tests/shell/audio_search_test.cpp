@@ -69,9 +69,9 @@ TEST(AudioSearch, FindsTheAudioFilesOfATreeWithProgress) {
 TEST(AudioSearch, CancelsSoonAndCanBeDestroyedWhileRunning) {
     TempDir dir;
     std::string files;
-    const size_t count = 40 * 50;
+    const size_t count = 20 * 40;
     for (size_t i = 0; i < count; ++i)
-        files += "d" + std::to_string(i / 50) + "/f" + std::to_string(i) + ".bin ";
+        files += "d" + std::to_string(i / 40) + "/f" + std::to_string(i) + ".bin ";
     test::make_tree(dir, files);
 
     AudioSearch search;

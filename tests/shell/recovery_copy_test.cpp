@@ -2,8 +2,11 @@
 
 #include <gtest/gtest.h>
 
-#include "engine/engine.h"
+#include <cstdlib>
+
 #include "export/otm_writer.h"
+#include "shell/command_handlers.h"
+#include "shell/program.h"
 #include "support/temp_dir.h"
 
 namespace ondrel {
@@ -11,54 +14,72 @@ namespace {
 
 using test::TempDir;
 
+void name_song(TMOD& song, const char* name, const char* path) {
+    set_text(song.name, name);
+    set_text(song.path, path);
+}
+
 TEST(RecoveryCopy, WriteFindReopenDiscard) {
     TempDir dir;
     const std::string state = dir.file("state/ondrel");  // created by the first write
-    EXPECT_FALSE(find_recovery_copy(state));
+    EXPECT_TRUE(find_recovery_copies(state).empty());
 
     Engine before;
-    TMOD& song = before.bank.current();
-    set_text(song.name, "unsaved work");
-    set_text(song.path, "/home/me/songs/work.mod");
-    song.speed = 3;
-    before.bank.pattern(song.patbase)->column(2)[5].note = 40;
+    name_song(before.bank.current(), "unsaved work", "/home/me/songs/work.mod");
+    before.bank.current().speed = 3;
+    before.bank.pattern(before.bank.current().patbase)->column(2)[5].note = 40;
     std::string why;
-    ASSERT_TRUE(write_recovery_copy(state, before.bank, before.bank.noimod, before.slots, why)) << why;
-    EXPECT_STREQ(song.path, "/home/me/songs/work.mod");
+    for (int copy = 0; copy < 2; ++copy)  // a second copy waits beside the first
+        ASSERT_TRUE(write_recovery_copy(state, before.bank, 0, before.slots, why)) << why;
+    EXPECT_STREQ(before.bank.current().path, "/home/me/songs/work.mod");
+    EXPECT_FALSE(write_recovery_copy(state, before.bank, 5, before.slots, why));
 
-    const auto copy = find_recovery_copy(state);
-    ASSERT_TRUE(copy);
-    EXPECT_EQ(copy->song_file, recovery_song_file(state));
-    EXPECT_EQ(copy->original_path, "/home/me/songs/work.mod");
+    const auto copies = find_recovery_copies(state);
+    ASSERT_EQ(copies.size(), 2u);
+    EXPECT_EQ(copies[0].song_file, state + "/recovery-0.otm");
+    EXPECT_EQ(copies[1].original_path, "/home/me/songs/work.mod");
 
     Engine after;
-    const LoadResult r = reopen_recovery_copy(*copy, after.bank, after.slots);
+    const LoadResult r = reopen_recovery_copy(copies[0], after.bank, after.slots);
     ASSERT_TRUE(r.ok) << r.error;
     EXPECT_STREQ(after.bank.current().path, "/home/me/songs/work.mod");
-    EXPECT_EQ(write_otm(after.bank, after.bank.noimod, after.slots),
-              write_otm(before.bank, before.bank.noimod, before.slots));
+    EXPECT_EQ(write_otm(after.bank, 0, after.slots), write_otm(before.bank, 0, before.slots));
 
-    discard_recovery_copy(state);
-    EXPECT_FALSE(find_recovery_copy(state));
-    discard_recovery_copy(state);  // twice is harmless
+    discard_recovery_copy(copies[0]);
+    ASSERT_EQ(find_recovery_copies(state).size(), 1u);
+    EXPECT_EQ(find_recovery_copies(state)[0].song_file, copies[1].song_file);
+    // A copy whose origin line is lost still counts, as a song never saved.
+    std::filesystem::remove(state + "/recovery-1.txt");
+    EXPECT_EQ(find_recovery_copies(state).at(0).original_path, "");
+    // The state directory cannot be made: a file stands in its way.
+    EXPECT_FALSE(
+        write_recovery_copy(dir.write("blocked", {1}) + "/ondrel", before.bank, 0, before.slots, why));
 }
 
-TEST(RecoveryCopy, RefusalsAndOddStates) {
+// The program's side: unsaved songs kept on a signal, offered back at the next start.
+TEST(RecoveryCopy, ProgramKeepsUnsavedSongsAndOffersThemBack) {
     TempDir dir;
-    Engine engine;
-    std::string why;
-    EXPECT_FALSE(write_recovery_copy(dir.path().string(), engine.bank, 5, engine.slots, why));
-    EXPECT_FALSE(why.empty());
-    // The state directory cannot be made: a file stands in its way.
-    const std::string blocked = dir.write("blocked", {1});
-    EXPECT_FALSE(write_recovery_copy(blocked + "/ondrel", engine.bank, 0, engine.slots, why));
+    setenv("XDG_STATE_HOME", dir.path().c_str(), 1);
+    {
+        Program ended;
+        name_song(ended.engine.bank.current(), "first", "/songs/first.otm");
+        ended.post(fourcc("NEWM"));
+        ended.run_pending();
+        name_song(ended.engine.bank.current(), "second", "");
+        ended.edit("cell", [](SongTransaction& t) { t.pattern(t.live().sequence[0])->col[0][0].note = 49; });
+        ended.quit_on_signal();  // only the second song has changes
+    }
+    ASSERT_EQ(find_recovery_copies(dir.file("ondrel")).size(), 1u);
 
-    // A song never saved has no original path; a copy without its origin line still counts.
-    ASSERT_TRUE(write_recovery_copy(dir.path().string(), engine.bank, 0, engine.slots, why)) << why;
-    std::filesystem::remove(dir.file("recovery-origin.txt"));
-    const auto copy = find_recovery_copy(dir.path().string());
-    ASSERT_TRUE(copy);
-    EXPECT_EQ(copy->original_path, "");
+    Program next;
+    offer_recovery_copies(next);
+    ASSERT_NE(next.alerts.front(), nullptr);
+    EXPECT_EQ(next.alerts.front()->buttons, (std::vector<std::string>{"Reopen", "Discard"}));
+    next.alerts.answer(0);
+    EXPECT_STREQ(next.engine.bank.current().name, "second");
+    EXPECT_EQ(next.engine.bank.pattern(next.engine.bank.current().patbase)->column(0)[0].note, 49);
+    EXPECT_TRUE(next.history().dirty());
+    EXPECT_TRUE(find_recovery_copies(dir.file("ondrel")).empty());
 }
 
 }  // namespace

@@ -2,7 +2,11 @@
 
 #include <gtest/gtest.h>
 
+#include "export/otm_writer.h"
 #include "platform/file_attributes.h"
+#include "shell/command_handlers.h"
+#include "shell/editor_cursor.h"
+#include "shell/program.h"
 #include "support/temp_dir.h"
 
 namespace ondrel {
@@ -75,6 +79,55 @@ TEST(SongFileAttributesQuiet, MissingFileOrNoPathChangesNothing) {
     EXPECT_FALSE(std::filesystem::exists(dir.file("absent.otm")));
     EXPECT_EQ(position.poscurx, 3);
     EXPECT_EQ(position.oftrack, 5);
+}
+
+}  // namespace
+}  // namespace ondrel
+
+namespace ondrel {
+namespace {
+
+// Opening a song puts the editor where its file says, inside the song whatever the file holds.
+TEST_F(SongFileAttributes, OpeningASongRestoresAPositionInsideIt) {
+    Program p;
+    std::string why;
+    ASSERT_TRUE(save_otm(dir_.file("song.otm"), p.engine.bank, 0, p.engine.slots, why)) << why;
+    const TMOD& song = p.engine.bank.current();
+    const int rows = song.rows[song.sequence[0]], tracks = song.nbtrack;
+    struct Case {
+        EditorPosition stored;
+        int nopat, row, track, field, view_top, oftrack;
+    };
+    const Case cases[] = {
+        {{0, 5, 2 * kFieldsPerTrack + 3, 4, 1}, 0, 5, 2, 3, 4, 1},
+        {{200, 30000, 32767, 32767, 300},
+         0,
+         rows - 1,
+         tracks - 1,
+         32767 % kFieldsPerTrack,
+         rows - 1,
+         tracks - 1},
+        {{-5, -1, -9, -2, -3}, 0, 0, 0, 0, 0, 0},
+    };
+    for (const Case& c : cases) {
+        writeinfo_in_file(dir_.file("song.otm"), c.stored);
+        ShellMessage open(fourcc("refs"));
+        open.refs = {dir_.file("song.otm")};
+        p.post(open);
+        p.run_pending();
+        EXPECT_EQ(p.engine.player.tr.nopat, c.nopat);
+        const CursorPlace at = cursor_place(p);
+        EXPECT_EQ(std::tie(at.row, at.track, at.field), std::tie(c.row, c.track, c.field));
+        EXPECT_EQ(p.editor.view_top, c.view_top);
+        EXPECT_EQ(p.editor.oftrack, c.oftrack);
+    }
+    // Saving stores where the editor stands.
+    set_cursor_place(p, {7, 1, 2});
+    store_editor_position(p);
+    EditorPosition read{};
+    readinfo_in_file(dir_.file("song.otm"), read);
+    EXPECT_EQ(read.poscurv, 7);
+    EXPECT_EQ(read.poscurx, kFieldsPerTrack + 2);
 }
 
 }  // namespace
