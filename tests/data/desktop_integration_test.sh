@@ -18,7 +18,6 @@ icon=$prefix/share/icons/hicolor/scalable/apps/ondrel.svg
 for f in "$desktop" "$mime" "$icon"; do [ -s "$f" ] || fail "missing $f"; done
 
 grep -qx 'Exec=ondrel %F' "$desktop" || fail "launcher does not pass the files to ondrel"
-grep -qx 'Icon=ondrel' "$desktop" || fail "launcher names another icon"
 # Every type the launcher claims is defined by the package, and the other way round.
 claimed=$(sed -n 's/^MimeType=//p' "$desktop" | tr ';' '\n' | sed '/^$/d' | sort)
 defined=$(sed -n 's/.*<mime-type type="\([^"]*\)".*/\1/p' "$mime" | sort)
@@ -35,7 +34,6 @@ if command -v xmllint >/dev/null; then
     # Debian ships no schema for shared-mime-info packages: well-formedness here, and the
     # database compiler below checks the content.
     xmllint --noout "$mime" "$icon" || fail "xmllint"
-    [ "$(xmllint --xpath 'name(/*)' "$icon")" = svg ] || fail "icon is not an SVG document"
 else
     echo "skipped: xmllint is not installed"
 fi
@@ -51,7 +49,6 @@ if command -v update-mime-database >/dev/null; then
     for sig in 'M.K.' '8CHN' '32CH' 'SCRM' 'MTM' 'Extended Module: ' '2BIT'; do
         grep -qaF "$sig" "$db/magic" || fail "no magic for $sig"
     done
-    grep -q 'audio/x-mod' "$db/magic" || fail "no magic section for audio/x-mod"
 else
     echo "skipped: update-mime-database is not installed"
 fi

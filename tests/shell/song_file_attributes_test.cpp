@@ -121,13 +121,6 @@ TEST_F(SongFileAttributes, OpeningASongRestoresAPositionInsideIt) {
         EXPECT_EQ(p.editor.view_top, c.view_top);
         EXPECT_EQ(p.editor.oftrack, c.oftrack);
     }
-    // Saving stores where the editor stands.
-    set_cursor_place(p, {7, 1, 2});
-    store_editor_position(p);
-    EditorPosition read{};
-    readinfo_in_file(dir_.file("song.otm"), read);
-    EXPECT_EQ(read.poscurv, 7);
-    EXPECT_EQ(read.poscurx, kFieldsPerTrack + 2);
 }
 
 }  // namespace
