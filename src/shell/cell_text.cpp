@@ -28,9 +28,11 @@ CellText cell_text(const TNOTE& cell) {
 
     if (!cell.instrument)
         std::snprintf(t.instrument, sizeof t.instrument, "..");
-    else if (cell.instrument < 100)
-        std::snprintf(t.instrument, sizeof t.instrument, "%02d", cell.instrument);
-    else
+    else if (cell.instrument < 100) {
+        // Two digits by hand: some builds cannot tell that "%02d" fits and warn.
+        t.instrument[0] = static_cast<char>('0' + cell.instrument / 10);
+        t.instrument[1] = static_cast<char>('0' + cell.instrument % 10);
+    } else
         std::snprintf(t.instrument, sizeof t.instrument, "%c%d", 'A' + cell.instrument / 10 - 10,
                       cell.instrument % 10);
 
