@@ -130,7 +130,7 @@ void PatternView::draw(Program& p, const TMOD& song, ImVec2 size) {
         if (r == cursor.poscurv) band = kCursorRow;
         if (play_here && r == tr.nopos) band = kPlayRow;
         if (band) dl->AddRectFilled(ImVec2(origin.x, y), ImVec2(origin.x + width, y + row_h_), band);
-        char number[8];
+        char number[12];  // any int fits
         std::snprintf(number, sizeof number, "%03d", r);
         dl->AddText(ImVec2(origin.x + 3, y + 1), kRowNumber, number);
         for (int c = 0; c < visible_tracks_; ++c) {
