@@ -1,5 +1,6 @@
 #include <algorithm>
 
+#include "playback/envelope.h"
 #include "playback/player.h"
 
 namespace ondrel {
@@ -38,31 +39,8 @@ int Player::track_to_poly(int track) {
 float Player::compute_adsr(int kind, unsigned voice, unsigned long length, const p_s* env) const {
     if (!env || voice >= kVoices) return 0.0f;
     const Voice& v = nlist[voice];
-    uint64_t p = kind == 4 ? v.count1 : kind == 16 ? 192 : v.position;
-    // Kind 16 reads the velocity envelope's points at a fixed place.
-    const int k = kind == 16 ? 0 : std::clamp(kind, 0, 4);
-    int x = 0;
-    if (length != 0) x = static_cast<int>(std::min<uint64_t>(p * 255 / length, 255));
-    int px[5], level[5];
-    for (int j = 0; j < 5; ++j) {
-        px[j] = env->env(k, j) >> 8;
-        level[j] = env->env(k, j) & 0xff;
-    }
-    int value = 0;
-    if (x < px[1])
-        value = level[0] + (level[1] - level[0]) * x / px[1];
-    else
-        for (int j = 2; j <= 4; ++j)
-            if (x < px[j]) {
-                value = level[j - 1] + (level[j] - level[j - 1]) * (x - px[j - 1]) / (px[j] - px[j - 1]);
-                break;
-            }
-    switch (kind) {
-        case 1: return static_cast<float>(value * 2);
-        case 2: return static_cast<float>(std::min(value, 127));
-        case 3: return static_cast<float>(value);
-        default: return static_cast<float>(value) / 128.0f;
-    }
+    const uint64_t p = kind == 4 ? v.count1 : kind == 16 ? 192 : v.position;
+    return envelope_value(*env, kind, p, length);
 }
 
 }  // namespace ondrel

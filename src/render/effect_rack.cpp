@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <mutex>
 
+#include "render/effect_slot_rules.h"
+
 namespace ondrel {
 
 const char* basic_effect_label(int type) {
@@ -49,17 +51,10 @@ std::array<uint16_t, kTracks> EffectRack::routing() {
 }
 
 bool EffectRack::checkbufferefx(int track, int slot) {
-    const std::array<uint16_t, kTracks> tracke = routing();
-    std::array<bool, kEffectSlots> seen{};
-    int count = 0;
-    for (int t = 0; t < kTracks; ++t) {
-        const int s = t == track ? slot : tracke[t];
-        if (s > 0 && s < kEffectSlots && !seen[s]) {
-            seen[s] = true;
-            ++count;
-        }
-    }
-    return slots_.reserve_send_buffers(count);
+    uint16_t tracke[kTracks];
+    const std::array<uint16_t, kTracks> words = routing();
+    std::copy(words.begin(), words.end(), tracke);
+    return slots_.reserve_send_buffers(send_buffers_needed(tracke, track, slot));
 }
 
 void EffectRack::route(int track, int slot) {
@@ -73,73 +68,40 @@ void EffectRack::route(int track, int slot) {
 
 int EffectRack::mnplusefx(int track) {
     if (track < 0 || track >= kTracks) return -1;
-    int s = routing()[track];
-    for (int tries = 0; tries < kEffectSlots; ++tries) {
-        s = s >= 99 ? 1 : s + 1;
-        if (slots_.efxtype[s]) {
-            route(track, s);
-            return s;
-        }
-    }
-    return -1;
+    const int s = next_slot_up(slots_.efxtype, routing()[track]);
+    if (s >= 0) route(track, s);
+    return s;
 }
 
 int EffectRack::mnmoinsefx(int track) {
     if (track < 0 || track >= kTracks) return -1;
-    int s = routing()[track] - 1;
-    if (s < 0) s = 99;
-    // From slot 0 the walk goes on at 98: slot 99 is reached only by starting there.
-    for (int tries = 0; tries < 2 * kEffectSlots && !slots_.efxtype[s]; ++tries) s = s == 0 ? 98 : s - 1;
-    if (!slots_.efxtype[s]) return -1;
-    route(track, s);
+    const int s = next_slot_down(slots_.efxtype, routing()[track]);
+    if (s >= 0) route(track, s);
     return s;
 }
 
-int EffectRack::echo_clones() const {
-    int n = 0;
-    for (int s = kFirstClonedSlot; s < kEffectSlots; ++s) n += slots_.efxtype[s] == 11;
-    return n;
-}
-
 int EffectRack::clone(int slot) {
-    AlertSink* alerts = bank_.alerts();
-    if (slot == 12) {
-        if (alerts) alerts->show({"title", "You don't need to clone Efx 12", {"ok !!"}});
+    if (const auto refusal = clone_refusal(slot)) {
+        if (AlertSink* alerts = bank_.alerts()) alerts->show(*refusal);
         return -1;
     }
-    if (slot == 5 || slot == 10) {
-        if (alerts) alerts->show({"title", "You can't clone these Efx", {"why ?"}});
-        return -1;
-    }
-    if (slot <= 0 || slot >= kEffectSlots || !slots_.efxtype[slot]) return -1;
-    const int16_t type = slots_.efxtype[slot];
-    // The song keeps the settings of 16 echo instances.
-    if (type == 11 && echo_clones() >= kEchoUnits - 1) return -1;
-    for (int s = kFirstClonedSlot; s < kEffectSlots; ++s) {
-        if (slots_.efxtype[s]) continue;
-        std::lock_guard<StructureLock> guard(bank_.structure_lock());
-        slots_.efxtype[s] = type;
-        return s;
-    }
-    return -1;
+    const int s = clone_destination(slots_.efxtype, slot);
+    if (s < 0) return -1;
+    std::lock_guard<StructureLock> guard(bank_.structure_lock());
+    slots_.efxtype[s] = slots_.efxtype[slot];
+    return s;
 }
 
 bool EffectRack::remove(int slot) {
-    if (slot < kFirstClonedSlot) {
-        if (AlertSink* alerts = bank_.alerts())
-            alerts->show({"title", "You can't remove a basic Efx, only cloned efx !!", {"ah ah !"}});
+    if (const auto refusal = removal_refusal(slot)) {
+        if (AlertSink* alerts = bank_.alerts()) alerts->show(*refusal);
         return false;
     }
     if (slot >= kEffectSlots || !slots_.efxtype[slot]) return false;
-    TMOD& m = bank_.current();
     std::lock_guard<StructureLock> guard(bank_.structure_lock());
-    slots_.efxtype[slot] = 0;
-    // Tracks that were routed to it go back to their dry sound.
+    const uint64_t unrouted = remove_clone(slots_.efxtype, bank_.current().tracke, slot);
     for (int t = 0; t < kTracks; ++t)
-        if (m.tracke[t] == slot) {
-            m.tracke[t] = 0;
-            player_.efxaffiche[t] = 0;
-        }
+        if (unrouted >> t & 1) player_.efxaffiche[t] = 0;
     return true;
 }
 
@@ -164,14 +126,7 @@ void EffectRack::set_reverb_delay(int unit, int field, uint32_t microseconds) {
 void EffectRack::set_reverb_gain(int unit, int field, int thousandths) {
     std::lock_guard<StructureLock> guard(bank_.structure_lock());
     if (unit == 10) units_.firstreverb.set_gain(field, thousandths);
-    if (unit == 9) {
-        if (field < ReverbDHS::kCombs)
-            units_.secreverb.set_feedback(field, thousandths);
-        else if (field < 2 * ReverbDHS::kCombs)
-            units_.secreverb.set_tap(field - ReverbDHS::kCombs, thousandths);
-        else
-            units_.secreverb.set_output_gain(thousandths);
-    }
+    if (unit == 9) units_.secreverb.set_gain(field, thousandths);
 }
 
 void EffectRack::set_reverb_cutoff(int comb, int hz) {

@@ -46,7 +46,6 @@ public:
     void set_reverb_cutoff(int comb, int hz);
 
 private:
-    int echo_clones() const;
     std::array<uint16_t, kTracks> routing();
     void route(int track, int slot);
 

@@ -1,15 +1,13 @@
 #include "render/effect_units.h"
 
+#include "render/effect_slot_rules.h"
+
 namespace ondrel {
 
 EffectUnits::EffectUnits(SongBank& bank, EffectSlots& slots) : bank_(bank), slots_(slots) {}
 
 int EffectUnits::instance_of(int slot) const {
-    if (slot < kFirstClonedSlot) return 0;
-    int k = 0;
-    for (int s = kFirstClonedSlot; s <= slot && s < kEffectSlots; ++s)
-        k += slots_.efxtype[s] == slots_.efxtype[slot];
-    return k;
+    return effect_instance(slots_.efxtype, slot);
 }
 
 void EffectUnits::run(int slot, int type, const float* send, float* out, int frames, int control,

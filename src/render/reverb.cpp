@@ -22,46 +22,54 @@ Reverb::Reverb() {
     ok_ = true;
 }
 
-void Reverb::set_delay_us(int line, uint32_t microseconds) {
+uint32_t reverb_microseconds(uint32_t frames) {
+    return static_cast<uint32_t>((uint64_t{frames} * 10000 + 440) / 441);
+}
+
+int gain_thousandths(float gain) {
+    return static_cast<int>(gain * 1000.0f);
+}
+
+void ReverbSettings::set_delay_us(int line, uint32_t microseconds) {
     if (line < 0 || line >= kLines) return;
-    length_[line] = reverb_frames(microseconds, line == 6 ? 44099 : 11049);
+    length[line] = reverb_frames(microseconds, line == 6 ? 44099 : 11049);
 }
 
-void Reverb::set_gain(int field, int thousandths) {
+void ReverbSettings::set_gain(int field, int thousandths) {
     const float g = thousandths / 1000.0f;
-    if (field >= 0 && field < 4) feedback_[field] = g;
-    if (field == 4 || field == 5) allpass_[field - 4] = g;
-    if (field == 6) output_gain_ = g;
+    if (field >= 0 && field < 4) feedback[field] = g;
+    if (field == 4 || field == 5) allpass[field - 4] = g;
+    if (field == 6) output_gain = g;
 }
 
-float Reverb::gain(int field) const {
-    if (field >= 0 && field < 4) return feedback_[field];
-    if (field == 4 || field == 5) return allpass_[field - 4];
-    return output_gain_;
+float ReverbSettings::gain(int field) const {
+    if (field >= 0 && field < 4) return feedback[field];
+    if (field == 4 || field == 5) return allpass[field - 4];
+    return output_gain;
 }
 
-void Reverb::set_cutoff(int comb, float hz) {
-    if (comb >= 0 && comb < 4) cutoff_[comb] = std::clamp(hz, 10.0f, 11050.0f);
+void ReverbSettings::set_cutoff(int comb, float hz) {
+    if (comb >= 0 && comb < kCombs) cutoff[comb] = std::clamp(hz, 10.0f, 11050.0f);
 }
 
 void Reverb::compute(const float* in, float* out, long frames, float gain_left, float gain_right) {
     if (!ok_) return;
     std::array<OnePoleCoefficients, 4> k{};
-    for (int c = 0; c < 4; ++c) k[c] = OnePoleCoefficients::for_cutoff(cutoff_[c]);
+    for (int c = 0; c < 4; ++c) k[c] = OnePoleCoefficients::for_cutoff(s_.cutoff[c]);
     std::array<float*, kLines> base{};
     for (int l = 0; l < kLines; ++l) {
         base[l] = line_[l].get();
-        if (cursor_[l] >= length_[l]) cursor_[l] = 0;
+        if (cursor_[l] >= s_.length[l]) cursor_[l] = 0;
     }
-    const float g1 = allpass_[0], g2 = allpass_[1];
+    const float g1 = s_.allpass[0], g2 = s_.allpass[1];
     long done = 0;
     while (done < frames) {
         // Blocks end where the first line wraps, so the loops below never test for it, and
         // hold no more frames than the shortest line: no cell a block reads was written in
         // the same block, so each step can run over the whole block before the next.
         long block = std::min<long>(frames - done, kChunk);
-        for (int l = 0; l < kLines; ++l) block = std::min<long>(block, length_[l] - cursor_[l]);
-        block = std::min<long>(block, *std::min_element(length_.begin(), length_.end()));
+        for (int l = 0; l < kLines; ++l) block = std::min<long>(block, s_.length[l] - cursor_[l]);
+        block = std::min<long>(block, *std::min_element(s_.length.begin(), s_.length.end()));
         std::array<float*, kLines> p{};
         for (int l = 0; l < kLines; ++l) p[l] = base[l] + cursor_[l];
         const float* x_in = in + done;
@@ -75,7 +83,7 @@ void Reverb::compute(const float* in, float* out, long frames, float gain_left, 
         float* const ys[4] = {y[0], y[1], y[2], y[3]};
         low_passes(lowpass_.data(), k.data(), d, ys, block);
         for (int c = 0; c < 4; ++c)
-            for (long i = 0; i < block; ++i) p[c][i] = y[c][i] * feedback_[c] + x[i];
+            for (long i = 0; i < block; ++i) p[c][i] = y[c][i] * s_.feedback[c] + x[i];
         float* o = out + 2 * done;
         for (long i = 0; i < block; ++i) {
             float& a1 = p[4][i];
@@ -90,7 +98,7 @@ void Reverb::compute(const float* in, float* out, long frames, float gain_left, 
             a2 = w2;
             float& delay = p[6][i];
             const float yd = flush(delay);
-            delay = out2 * output_gain_;
+            delay = out2 * s_.output_gain;
             o[2 * i] += yd * gain_left;
             o[2 * i + 1] -= yd * gain_right;
         }
@@ -98,7 +106,7 @@ void Reverb::compute(const float* in, float* out, long frames, float gain_left, 
         for (int l = 0; l < kLines; ++l) {
             uint32_t& c = cursor_[l];
             c += static_cast<uint32_t>(block);
-            if (c >= length_[l]) c = 0;
+            if (c >= s_.length[l]) c = 0;
         }
     }
 }
