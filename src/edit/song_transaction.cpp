@@ -3,6 +3,8 @@
 #include <cstring>
 #include <mutex>
 
+#include "render/effect_units.h"
+
 namespace ondrel {
 
 PatternRef copy_pattern(const Pattern& pattern) {
@@ -90,9 +92,31 @@ std::array<int16_t, kEffectSlots>& SongTransaction::effect_types() {
     return *effect_types_;
 }
 
+const std::array<int16_t, kEffectSlots>& SongTransaction::view_effect_types() const {
+    return effect_types_ ? *effect_types_ : slots_.efxtype;
+}
+
+ReverbSettings& SongTransaction::reverb(EffectUnits& units) {
+    units_ = &units;
+    if (!reverb_) reverb_ = units.firstreverb.settings();
+    return *reverb_;
+}
+
+ReverbDHSSettings& SongTransaction::reverb_dhs(EffectUnits& units) {
+    units_ = &units;
+    if (!reverb_dhs_) reverb_dhs_ = units.secreverb.settings();
+    return *reverb_dhs_;
+}
+
+bool SongTransaction::reverbs_changed() const {
+    return (reverb_ && *reverb_ != units_->firstreverb.settings()) ||
+           (reverb_dhs_ && *reverb_dhs_ != units_->secreverb.settings());
+}
+
 bool SongTransaction::changed() const {
     if (!patterns_.empty() || !samples_.empty()) return true;
     if (effect_types_ && *effect_types_ != slots_.efxtype) return true;
+    if (reverbs_changed()) return true;
     return record_ && std::memcmp(record_.get(), original_.get(), sizeof(TMOD)) != 0;
 }
 
@@ -106,6 +130,9 @@ EditStep SongTransaction::commit() {
     for (auto& [local, pattern] : patterns_) step.patterns.emplace_back(local, std::move(pattern));
     for (auto& [local, sample] : samples_) step.samples.emplace_back(local, std::move(sample));
     if (effect_types_ && *effect_types_ != slots_.efxtype) step.effect_types = effect_types_;
+    if (reverb_ && *reverb_ != units_->firstreverb.settings()) step.reverb = reverb_;
+    if (reverb_dhs_ && *reverb_dhs_ != units_->secreverb.settings()) step.reverb_dhs = reverb_dhs_;
+    if (step.reverb || step.reverb_dhs) step.units = units_;
     patterns_.clear();
     samples_.clear();
     swap_with_live(step, bank_, slots_, record_changed ? original_.get() : nullptr);

@@ -38,12 +38,20 @@ public:
     void set_sample(int local, SampleRef sample);
     // The effect types of the slots (shared by all songs).
     std::array<int16_t, kEffectSlots>& effect_types();
+    const std::array<int16_t, kEffectSlots>& view_effect_types() const;
+    // The effect slots' memory, for reserving what a change needs before it is swapped in.
+    EffectSlots& slots() { return slots_; }
+    // The settings of units' two reverbs (shared by all songs), to change.
+    ReverbSettings& reverb(EffectUnits& units);
+    ReverbDHSSettings& reverb_dhs(EffectUnits& units);
 
     bool changed() const;
     // Swaps the changes in; the returned step undoes them (empty when nothing changed).
     EditStep commit();
 
 private:
+    bool reverbs_changed() const;
+
     SongBank& bank_;
     EffectSlots& slots_;
     std::string label_;
@@ -52,6 +60,9 @@ private:
     std::map<int, PatternRef> patterns_;
     std::map<int, SampleRef> samples_;
     std::optional<std::array<int16_t, kEffectSlots>> effect_types_;
+    EffectUnits* units_ = nullptr;
+    std::optional<ReverbSettings> reverb_;
+    std::optional<ReverbDHSSettings> reverb_dhs_;
 };
 
 PatternRef copy_pattern(const Pattern& pattern);

@@ -15,49 +15,13 @@
 #include "export/wav_writer.h"
 #include "import/loader.h"
 #include "import/sound_reader.h"
+#include "support/fake_audio_device.h"
 #include "support/temp_dir.h"
 
 namespace ondrel {
 namespace {
 
-// Runs the callback under a device mutex, as SDL does, and is the bank's structure lock.
-class FakeDevice final : public StructureLock {
-public:
-    explicit FakeDevice(Engine& e) : engine_(e) {}
-    ~FakeDevice() override { stop(); }
-    void lock() override { mutex_.lock(); }
-    void unlock() override { mutex_.unlock(); }
-
-    void start() {
-        engine_.bank.set_structure_lock(this);
-        engine_.player.audio_running = true;
-        thread_ = std::thread([this] {
-            std::vector<float> buffer(2 * 512);
-            while (!quit_) {
-                {
-                    std::lock_guard<std::mutex> guard(mutex_);
-                    engine_.mixer.BufferProc(nullptr, buffer.data(), buffer.size() * 4, AudioFormat{});
-                }
-                ++buffers;
-                std::this_thread::sleep_for(std::chrono::microseconds(300));
-            }
-        });
-    }
-    void stop() {
-        if (!thread_.joinable()) return;
-        quit_ = true;
-        thread_.join();
-        engine_.player.audio_running = false;
-        engine_.bank.set_structure_lock(nullptr);
-    }
-    std::atomic<int> buffers{0};
-
-private:
-    Engine& engine_;
-    std::mutex mutex_;
-    std::thread thread_;
-    std::atomic<bool> quit_{false};
-};
+using test::FakeDevice;
 
 // A song with samples, notes, effect routing and commands in every track, saved to path.
 void write_song(const std::string& path) {
@@ -83,8 +47,12 @@ void write_song(const std::string& path) {
     for (int r = 0; r < 64; ++r)
         for (int t = 0; t < 8; ++t)
             if ((r + t) % 3 == 0)
-                p->col[t][r] = {static_cast<uint8_t>(36 + (r * 7 + t) % 40), 0, 0, static_cast<uint8_t>(1 + t % 4),
-                                static_cast<uint8_t>(t == 5 ? 33 : (r % 16)), static_cast<uint8_t>(t == 5 ? 11 : r)};
+                p->col[t][r] = {static_cast<uint8_t>(36 + (r * 7 + t) % 40),
+                                0,
+                                0,
+                                static_cast<uint8_t>(1 + t % 4),
+                                static_cast<uint8_t>(t == 5 ? 33 : (r % 16)),
+                                static_cast<uint8_t>(t == 5 ? 11 : r)};
     m.tracke[2] = 10;
     m.tracke[3] = 16;
     std::string why;
