@@ -5,6 +5,8 @@
 #include <filesystem>
 #include <iostream>
 
+#include "cli/commands.h"
+#include "export/otm_writer.h"
 #include "import/loader.h"
 #include "import/sound_reader.h"
 #include "platform/mime_type.h"
@@ -17,6 +19,13 @@ FileClass classify(const std::string& path) {
         case kModuleFile: return FileClass::Song;
         default: return FileClass::Other;
     }
+}
+
+int save_song_for_cli(Engine& engine, const std::string& path) {
+    std::string why;
+    if (save_otm(path, engine.bank, engine.bank.noimod, engine.slots, why)) return kExitOk;
+    std::cerr << "ondrel: " << why << "\n";
+    return kExitFailed;
 }
 
 bool load_for_cli(Engine& engine, const std::string& path) {

@@ -14,6 +14,10 @@ FileClass classify(const std::string& path);
 // false. A file that ends early loads with a warning. Sounds and other files are refused.
 bool load_for_cli(Engine& engine, const std::string& path);
 
+// Saves the engine's current song as a .otm file at path; the exit status (one line on
+// stderr when it fails).
+int save_song_for_cli(Engine& engine, const std::string& path);
+
 // True when the stream is a terminal (progress and status lines go there only).
 bool is_terminal(int fd);
 

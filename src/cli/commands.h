@@ -15,6 +15,7 @@ using Args = std::vector<std::string>;
 int cmd_info(const Args& args);
 int cmd_convert(const Args& args);
 int cmd_set_sound(const Args& args);
+int cmd_edit_sound(const Args& args);
 int cmd_play(const Args& args);
 int cmd_render(const Args& args);
 

@@ -7,7 +7,6 @@
 #include "cli/commands.h"
 #include "cli/song_report.h"
 #include "engine/engine.h"
-#include "export/otm_writer.h"
 #include "import/loader.h"
 #include "import/sound_reader.h"
 #include "platform/mime_type.h"
@@ -107,12 +106,7 @@ int cmd_set_sound(const Args& args) {
         std::cerr << "ondrel: " << r.error << "\n";
         return kExitFailed;
     }
-    std::string why;
-    if (!save_otm(out, engine.bank, engine.bank.noimod, engine.slots, why)) {
-        std::cerr << "ondrel: " << why << "\n";
-        return kExitFailed;
-    }
-    return kExitOk;
+    return save_song_for_cli(engine, out);
 }
 
 int cmd_convert(const Args& args) {
@@ -138,12 +132,7 @@ int cmd_convert(const Args& args) {
     }
     Engine engine;
     if (!load_for_cli(engine, in)) return kExitFailed;
-    std::string why;
-    if (!save_otm(out, engine.bank, engine.bank.noimod, engine.slots, why)) {
-        std::cerr << "ondrel: " << why << "\n";
-        return kExitFailed;
-    }
-    return kExitOk;
+    return save_song_for_cli(engine, out);
 }
 
 }  // namespace ondrel

@@ -23,6 +23,9 @@ const Command kCommands[] = {
      ondrel::cmd_convert},
     {"set-sound", "set-sound SONG SLOT SOUND -o OUT   put a WAV/AIFF/AVR sound into a song's slot",
      ondrel::cmd_set_sound},
+    {"edit-sound",
+     "edit-sound SONG SLOT OP [--from F --to T] -o OUT   fade, normalize, reverse or invert a sound",
+     ondrel::cmd_edit_sound},
 };
 
 void usage(std::ostream& out) {
@@ -54,7 +57,8 @@ int main(int argc, char** argv) {
         if (first == c.name) return c.run(ondrel::Args(argv + 2, argv + argc));
     // Anything else that names a file: open it (and those after it) in the desktop program.
     std::error_code ec;
-    if (std::filesystem::exists(first, ec) || first.find('/') != std::string::npos || first.find('.') != std::string::npos)
+    if (std::filesystem::exists(first, ec) || first.find('/') != std::string::npos ||
+        first.find('.') != std::string::npos)
         return ondrel::run_desktop(std::vector<std::string>(argv + 1, argv + argc));
     std::cerr << "ondrel: unknown command '" << first << "'\n\n";
     usage(std::cerr);

@@ -214,6 +214,45 @@ if os.path.exists(wav_path):
 else:
     print("corpus sounds not here: sound checks skipped")
 
+# edit-sound: the sample editor's tools on one sound, the rest of the song kept.
+with tempfile.TemporaryDirectory() as tmp:
+    first = demo["samples"][0]
+    slot, frames = str(first["index"]), first["length"] >> first["framecode"]
+    out = os.path.join(tmp, "edited.otm")
+
+    def samples_after(*args):
+        r = run("edit-sound", *args, "-o", out)
+        check(f"edit-sound {args} exit", r.returncode == 0 and r.stderr == "", r.stderr)
+        return {x["index"]: x for x in json_report(out)["samples"]}
+
+    before = {x["index"]: x for x in demo["samples"]}
+    after = samples_after(DEMO, slot, "reverse")
+    check("reverse changes that sound only", after[first["index"]]["crc32"] != first["crc32"]
+          and all(after[i] == before[i] for i in before if i != first["index"]))
+    twice = os.path.join(tmp, "twice.otm")
+    os.replace(out, twice)
+    check("reverse twice gives the sound back", samples_after(twice, slot, "reverse") == before)
+    check("one frame reversed is the same", samples_after(DEMO, slot, "reverse", "--from", "5", "--to", "6") == before)
+    edited = samples_after(DEMO, slot, "fade-in", "--from", "0", "--to", str(frames // 2))[first["index"]]
+    check("fade-in changes the data, not the format", edited["crc32"] != first["crc32"]
+          and edited["length"] == first["length"] and edited["bits"] == first["bits"], edited)
+    os.remove(out)
+    empty_slot = str(next(i for i in range(1, 129) if i not in before))
+    refusals = [
+        ((DEMO, slot, "sharpen"), 2, "unknown operation"),
+        ((DEMO, empty_slot, "reverse"), 1, "holds no sound"),
+        ((DEMO, slot, "reverse", "--from", "0", "--to", str(frames + 1)), 2, "not inside"),
+        ((DEMO, slot, "reverse", "--from", "9", "--to", "9"), 2, "not inside"),
+        ((DEMO, slot, "reverse", "--from", "-3"), 2, "frame number"),
+        ((DEMO, "129", "reverse"), 2, "SLOT"),
+        ((os.path.join(tmp, "missing.otm"), slot, "reverse"), 1, "missing.otm"),
+    ]
+    for args, status, words in refusals:
+        r = run("edit-sound", *args, "-o", out)
+        check(f"edit-sound {args} refused", r.returncode == status and r.stderr.count("\n") == 1
+              and words in r.stderr and not os.path.exists(out), (r.returncode, r.stderr))
+    check("edit-sound help", run("edit-sound", "--help").returncode == 0)
+
 # Usage errors exit 2; help exits 0.
 check("no command", run().returncode == 2)
 check("unknown command", run("frobnicate").returncode == 2)
