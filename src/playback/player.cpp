@@ -37,88 +37,96 @@ int Player::dopatend() {
 }
 
 void Player::gere_play() {
-    if (tr.fvuvu.load(std::memory_order_relaxed)) {
+    // What this thread writes here, the window thread only shows: relaxed stores, since a
+    // sequentially consistent one is a locked exchange, paid several times a buffer.
+    constexpr auto relaxed = std::memory_order_relaxed;
+    if (tr.fvuvu.load(relaxed)) {
         // Only meters a note lit still fall; the rest stay at zero.
         static_assert(kTracks <= 64, "a bit per track");
         for (uint64_t bits = falling_meters_; bits; bits &= bits - 1) {
             const int t = __builtin_ctzll(bits);
-            const float v = tr.valvu[t].load(std::memory_order_relaxed) - 1.0f;
-            tr.valvu[t].store(std::max(v, 0.0f), std::memory_order_relaxed);
+            const float v = tr.valvu[t].load(relaxed) - 1.0f;
+            tr.valvu[t].store(std::max(v, 0.0f), relaxed);
             if (v <= 0.0f) falling_meters_ &= ~(uint64_t{1} << t);
         }
     }
-    const uint8_t playing = tr.playing;
-    if (playing != tr.oldplaying) tr.startplaying = static_cast<int64_t>(system_time_us());
-    tr.oldplaying = playing;
-    if (!playing && !tr.fplayonenote && !tr.fplaytrack) {
-        tr.notick = 0;
+    const uint8_t playing = tr.playing.load(std::memory_order_acquire);
+    if (playing != tr.oldplaying.load(relaxed)) {
+        tr.startplaying.store(static_cast<int64_t>(system_time_us()), relaxed);
+        tr.oldplaying.store(playing, relaxed);
+    }
+    if (!playing && !tr.fplayonenote.load(relaxed) && !tr.fplaytrack.load(relaxed)) {
+        tr.notick.store(0, relaxed);
         return;
     }
 
     const TMOD& m = bank_.current();
-    const bool track_mode = tr.fplaytrack;
-    const int left_pos = track_mode ? tr.nopatplaytrack.load() : tr.nopat.load();
+    const bool track_mode = tr.fplaytrack.load(relaxed);
+    const int left_pos = track_mode ? tr.nopatplaytrack.load(relaxed) : tr.nopat.load(relaxed);
     local_pos_ = left_pos;
     int first = 0;
-    int last = std::min<int>(bank_.nbvoie, kTracks) - 1;
-    if (track_mode) first = last = std::clamp<int>(tr.notrkplaytrack, 0, kTracks - 1);
-    const bool audition = tr.fplayonenote && tr.afpending.load(std::memory_order_acquire);
-    const int audition_track = std::clamp<int>(tr.aftrack, 0, kTracks - 1);
-    if (tr.fplayonenote && !tr.faccedit && !playing) first = last = audition_track;
+    int last = std::min<int>(bank_.nbvoie.load(relaxed), kTracks) - 1;
+    if (track_mode) first = last = std::clamp<int>(tr.notrkplaytrack.load(relaxed), 0, kTracks - 1);
+    const bool one_note = tr.fplayonenote.load(relaxed);
+    const bool audition = one_note && tr.afpending.load(std::memory_order_acquire);
+    const int audition_track = std::clamp<int>(tr.aftrack.load(relaxed), 0, kTracks - 1);
+    if (one_note && !tr.faccedit.load(relaxed) && !playing) first = last = audition_track;
 
     if (const Pattern* pattern = bank_.pattern(ilestou(left_pos)))
         for (int t = first; t <= last; ++t) read_track(t, left_pos, pattern, audition && t == audition_track);
 
-    if (tr.patdelay > 0) {
-        tr.patdelay = static_cast<int16_t>(tr.patdelay - 1);
-        tr.notick = 1;
+    int notick;
+    if (const int16_t delay = tr.patdelay.load(relaxed); delay > 0) {
+        tr.patdelay.store(static_cast<int16_t>(delay - 1), relaxed);
+        notick = 1;
     } else {
-        tr.notick = static_cast<int16_t>(tr.notick + 1);
+        notick = tr.notick.load(relaxed) + 1;
     }
-    if (tr.notick < 2 * m.speed) return;
+    if (notick < 2 * m.speed) {
+        tr.notick.store(static_cast<int16_t>(notick), relaxed);
+        return;
+    }
 
     // End of the row.
-    if (tr.fplayonenote) tr.fplayonenote = 0;
-    if (!tr.playing) {
-        tr.notick = 0;
+    tr.notick.store(0, relaxed);
+    if (one_note) tr.fplayonenote.store(0, relaxed);
+    if (!tr.playing.load(relaxed)) return;
+    if (tr.fplayline.load(relaxed)) {
+        tr.fplayline.store(0, relaxed);
+        tr.playing.store(0, relaxed);
         return;
     }
-    if (tr.fplayline) {
-        tr.fplayline = 0;
-        tr.playing = 0;
-        tr.notick = 0;
-        return;
-    }
-    tr.notick = 0;
     int pos = local_pos_;
-    if (tr.fbreak) {
-        pos = tr.breakpat;
-        tr.nopos = tr.breaklig.load();
-        tr.fbreak = 0;
-        tr.patdelay = 0;
+    int row;
+    if (tr.fbreak.load(relaxed)) {
+        pos = tr.breakpat.load(relaxed);
+        row = tr.breaklig.load(relaxed);
+        tr.fbreak.store(0, relaxed);
+        tr.patdelay.store(0, relaxed);
     } else {
-        tr.nopos = static_cast<int16_t>(tr.nopos + 1);
+        row = tr.nopos.load(relaxed) + 1;
     }
     // The row count is that of the pattern being left, even after a jump.
     const int rows = m.rows[m.sequence[std::clamp(left_pos, 0, kPositions - 1)]];
-    const bool wrapped = tr.nopos > rows - 1;
-    if (wrapped) tr.nopos = 0;
-    if (!track_mode && !tr.playp) {
+    const bool wrapped = row > rows - 1;
+    tr.nopos.store(static_cast<int16_t>(wrapped ? 0 : row), relaxed);
+    const bool floop = tr.floop.load(relaxed);
+    if (!track_mode && !tr.playp.load(relaxed)) {
         if (wrapped) ++pos;
         // A jump past the last position ends the song like running off its end.
-        if (pos >= tr.patend) {
-            if (!tr.floop) {
-                tr.playing = 0;
+        if (pos >= tr.patend.load(relaxed)) {
+            if (!floop) {
+                tr.playing.store(0, relaxed);
                 to_window.push({kMsgStop});
             }
-            pos = tr.patstart;
+            pos = tr.patstart.load(relaxed);
         }
-    } else if (!track_mode && wrapped && !tr.floop) {
-        tr.playing = 0;
+    } else if (!track_mode && wrapped && !floop) {
+        tr.playing.store(0, relaxed);
         to_window.push({kMsgStop});
     }
-    if (!track_mode) tr.nopat = static_cast<int16_t>(std::clamp(pos, 0, kPositions - 1));
-    if (watching_ && tr.playing) mark_visited();
+    if (!track_mode) tr.nopat.store(static_cast<int16_t>(std::clamp(pos, 0, kPositions - 1)), relaxed);
+    if (watching_ && tr.playing.load(relaxed)) mark_visited();
 }
 
 void Player::watch_for_repeats(bool on) {
@@ -151,6 +159,17 @@ void Player::read_track(int t, int position, const Pattern* pattern, bool auditi
         cell = tr.afnote;
     } else if (const TNOTE* c = pattern->cell(t, tr.nopos)) {
         if (tr.nopos < m.rows[m.sequence[position]]) cell = *c;
+    }
+    // Most cells of a sparse song are empty: at row start such a cell only ends the
+    // track's portamento row, and on the other calls it does nothing.
+    if (cell.empty() && !audition_cell) {
+        if (tr.notick.load(std::memory_order_relaxed) == 0 &&
+            tr.patdelay.load(std::memory_order_relaxed) == 0) {
+            nlist[t].portaflag = 0;
+            nlist[t].noteperiod = 0;
+            curvoice_[t] = static_cast<int16_t>(t);
+        }
+        return;
     }
     const bool delayed =
         (cell.command == 14 && (cell.parameter >> 4) == 13) || (cell.command == 26 && cell.parameter != 0);

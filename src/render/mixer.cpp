@@ -18,7 +18,17 @@ enum Envelope { kEnvVolume = 1, kEnvSend = 2, kEnvPan = 4, kEnvPitch = 8, kEnvFa
 }  // namespace
 
 Mixer::Mixer(SongBank& bank, EffectSlots& slots, Player& player)
-    : bank_(bank), slots_(slots), player_(player) {}
+    : bank_(bank), slots_(slots), player_(player), tab_pan_(tab_pan()), floatnote_(floatnote()) {
+    for (int bits16 = 0; bits16 < 2; ++bits16)
+        for (int out = 0; out < 2; ++out) {
+            const auto out_mode = static_cast<OutMode>(out);
+            stereo_loops_[bits16][out] = stereo_mixer(bits16, out_mode);
+            for (int interpolate = 0; interpolate < 2; ++interpolate)
+                for (int send = 0; send < 3; ++send)
+                    mono_loops_[bits16][interpolate][send][out] =
+                        mono_mixer(bits16, interpolate, static_cast<SendMode>(send), out_mode);
+        }
+}
 
 double Mixer::tick_frames() const {
     const int64_t t = bank_.current().tempo;
@@ -46,7 +56,8 @@ void Mixer::BufferProc(void*, void* buffer, unsigned long size, const AudioForma
 void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
     const bool measure = measure_load.load(std::memory_order_relaxed);
     const uint64_t entry = measure ? system_time_us() : 0;
-    nbpass.fetch_add(1, std::memory_order_relaxed);
+    // Only this thread counts: no locked add.
+    nbpass.store(nbpass.load(std::memory_order_relaxed) + 1, std::memory_order_relaxed);
     player_.service_audio_requests();
     if (bank_.loadin.load(std::memory_order_acquire)) {
         std::fill(out, out + 2 * frames, 0.0f);
@@ -57,6 +68,7 @@ void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
     const double tick = tick_frames();
     const double frame_rate = format.frame_rate > 0 ? format.frame_rate : kOutputRate;
     int c = 0;
+    bool silent = true;  // no voice has been heard in this call yet
     while (c < frames) {
         int n;
         if (ftemp.load(std::memory_order_relaxed)) {
@@ -78,10 +90,13 @@ void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
             n = frames;
         }
         render_piece(out, c, n, m, frame_rate);
+        silent = silent && !piece_has_setter_;
         c += n;
     }
-    effect_stage(out, frames, m);
-    output_stage(out, frames, format);
+    // A buffer of zeros needs no clipping and has no peak: a stopped or silent stretch
+    // of a song costs little more than clearing its buffer.
+    silent = !effect_stage(out, frames, m) && silent;
+    output_stage(out, frames, format, silent);
 
     if (!measure) return;
     const double budget = std::trunc((frames * 8 * 0.125 / frame_rate) * 1000000.0);
@@ -99,12 +114,16 @@ void Mixer::number_routed_slots(const TMOD& m) {
     }
     routed_count_ = 0;
     routed_by_slot_count_ = 0;
-    // Most tracks go to no slot: skip them four at a time.
+    // Most songs route no track at all, and most tracks go to no slot: look at the whole
+    // table at once, then at four tracks at a time.
     static_assert(kTracks % 4 == 0);
+    uint64_t words[kTracks / 4];
+    std::memcpy(words, m.tracke, sizeof words);
+    uint64_t any = 0;
+    for (const uint64_t w : words) any |= w;
+    if (any == 0) return;
     for (int t0 = 0; t0 < kTracks; t0 += 4) {
-        uint64_t four;
-        std::memcpy(&four, &m.tracke[t0], sizeof four);
-        if (four == 0) continue;
+        if (words[t0 / 4] == 0) continue;
         for (int t = t0; t < t0 + 4; ++t) {
             const int s = m.tracke[t];
             if (s > 0 && s < kEffectSlots && compact_[s] == 0) {
@@ -113,6 +132,7 @@ void Mixer::number_routed_slots(const TMOD& m) {
             }
         }
     }
+    if (routed_count_ == 0) return;
     // The effect stage runs the slots in their own order.
     std::copy_n(routed_.begin(), routed_count_, routed_by_slot_.begin());
     routed_by_slot_count_ = routed_count_;
@@ -124,6 +144,15 @@ void Mixer::render_piece(float* out, int c0, int n, const TMOD& m, double frame_
     // The first voice heard sets the piece's frames rather than adding to them (and clears
     // what it leaves), which saves clearing the buffer first.
     piece_has_setter_ = false;
+    const int pitch = std::clamp<int>(valpitch.load(std::memory_order_relaxed), 1, 255);
+    const PieceSettings piece{frame_rate,
+                              pitch > 128   ? 1 + (pitch - 128) * 0.0078125
+                              : pitch < 128 ? 2.0 - 128.0 / pitch
+                                            : 1.0,
+                              qual.load(std::memory_order_relaxed) == 1,
+                              m.globalvol * kMasterStep,
+                              m.mode,
+                              slots_.nsendbuffers.load(std::memory_order_acquire)};
     // In index order: the order decides which voice sets a slot's control value.
     for (int w = 0; w < kVoices / 64; ++w) {
         uint64_t& hint = player_.active_hint[w];
@@ -131,7 +160,7 @@ void Mixer::render_piece(float* out, int c0, int n, const TMOD& m, double frame_
             const int b = __builtin_ctzll(bits);
             const int vi = w * 64 + b;
             if (player_.nlist[vi].active)
-                render_voice(vi, out, c0, n, m, frame_rate);
+                render_voice(vi, out, c0, n, m, piece);
             else
                 hint &= ~(uint64_t{1} << b);
         }
@@ -139,7 +168,7 @@ void Mixer::render_piece(float* out, int c0, int n, const TMOD& m, double frame_
     if (!piece_has_setter_) std::fill(out + 2 * c0, out + 2 * (c0 + n), 0.0f);
 }
 
-void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, double frame_rate) {
+void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const PieceSettings& piece) {
     Voice& v = player_.nlist[vi];
     const int inst = v.instrument > 0 ? v.instrument - 1 : 0;
     if (inst >= kSamplesPerSong || inst == bank_.loadininst.load(std::memory_order_relaxed)) return;
@@ -161,10 +190,8 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     const bool released = v.keyoff != 0;
 
     // Step.
-    const int pitch = std::clamp<int>(valpitch.load(std::memory_order_relaxed), 1, 255);
-    double step = (floatnote()[std::clamp<int>(s->refnote, 0, 127)] / v.period) * (s->rate / frame_rate);
-    if (pitch > 128) step *= 1 + (pitch - 128) * 0.0078125;
-    if (pitch < 128) step *= 2.0 - 128.0 / pitch;
+    double step = (floatnote_[std::clamp<int>(s->refnote, 0, 127)] / v.period) * (s->rate / piece.frame_rate);
+    step *= piece.pitch_factor;
     if (env & kEnvPitch) {
         const float e = player_.compute_adsr(3, vi, static_cast<unsigned long>(frames), s);
         if (e != 64.0f) step *= std::pow(1.059463094, (e - 64) * 0.015625);
@@ -187,9 +214,9 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     if (env & kEnvPan)
         pan = static_cast<int>(player_.compute_adsr(2, vi, static_cast<unsigned long>(frames), s));
     pan = std::clamp(pan, 0, 127);
-    float gl = g * tab_pan()[pan];
-    float gr = g * tab_pan()[127 - pan];
-    switch (m.mode) {
+    float gl = g * tab_pan_[pan];
+    float gr = g * tab_pan_[127 - pan];
+    switch (piece.mode) {
         case 1:  // Amiga: voices 0 and 3 right, 1 and 2 left
             if (vi % 4 == 0 || vi % 4 == 3)
                 gl = 0;
@@ -204,7 +231,7 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
             break;
         default: break;
     }
-    const float master = m.globalvol * kMasterStep;
+    const float master = piece.master;
     gl *= m.trackpan[track] * kStep * master;
     gr *= m.trackpan2[track] * kStep * master;
 
@@ -212,7 +239,7 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     float send_level = 0;
     const int slot = m.tracke[track];
     const int k = slot > 0 && slot < kEffectSlots ? compact_[slot] : 0;
-    if (k > 0 && k <= slots_.nsendbuffers.load(std::memory_order_acquire)) {
+    if (k > 0 && k <= piece.sends_ready) {
         const float e1 = (env & kEnvSend) ? player_.compute_adsr(1, vi, static_cast<unsigned long>(frames), s)
                                           : static_cast<float>(m.trackc[track]);
         control_[slot] = static_cast<int16_t>(e1);
@@ -238,18 +265,19 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     }
     const float q = s->bits == 8 ? 0.0078125f : 3.0517578e-05f;
     const MixGains gains{q * gl, q * gr, q * (send_level * master * g)};
-    const bool interpolate = qual.load(std::memory_order_relaxed) == 1 || (s->flag2 & 1);
+    const bool interpolate = piece.interpolate || (s->flag2 & 1);
     const bool muted = mute[track].load(std::memory_order_relaxed) != 0;
     const bool stereo = s->stereo != 0;
     const bool bits16 = s->bits == 16;
 
     const bool sets = !piece_has_setter_ && !muted;
     const OutMode out_mode = sets ? OutMode::Set : OutMode::Add;
-    const StereoMixFn mix_stereo = stereo ? stereo_mixer(bits16, out_mode) : nullptr;
+    const int out_index = static_cast<int>(out_mode);
+    const StereoMixFn mix_stereo = stereo_loops_[bits16][out_index];
+    const auto& mono_loops = mono_loops_[bits16][interpolate];
     const MonoMixFn mix_alone =
-        stereo ? nullptr : mono_mixer(bits16, interpolate, send ? SendMode::First : SendMode::None, out_mode);
-    const MonoMixFn mix_adding =
-        send && !stereo ? mono_mixer(bits16, interpolate, SendMode::Add, out_mode) : nullptr;
+        mono_loops[static_cast<int>(send ? SendMode::First : SendMode::None)][out_index];
+    const MonoMixFn mix_adding = mono_loops[static_cast<int>(SendMode::Add)][out_index];
 
     int64_t pos = v.position;
     double f = v.fraction;
@@ -295,8 +323,10 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
             x = (send && written_[k] ? mix_adding : mix_alone)(s->data, pos, x, step, cnt, o, send, gains);
             if (send) written_[k] = 1;
         }
-        pos += static_cast<int64_t>(x);
-        f = x - std::floor(x);
+        // x is never negative: its whole part is its floor.
+        const int64_t whole = static_cast<int64_t>(x);
+        pos += whole;
+        f = x - static_cast<double>(whole);
         o += 2 * cnt;
         if (send) send += cnt;
         if (released && (env & kEnvFade)) v.count1 += static_cast<uint32_t>(adv);
@@ -317,11 +347,12 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, doubl
     v.fraction = static_cast<float>(f);
 }
 
-void Mixer::effect_stage(float* out, int frames, TMOD& m) {
-    pass.fetch_add(1, std::memory_order_relaxed);
+bool Mixer::effect_stage(float* out, int frames, TMOD& m) {
+    pass.store(pass.load(std::memory_order_relaxed) + 1, std::memory_order_relaxed);
     if (units_) units_->begin_buffer();
     const int ready = slots_.nsendbuffers.load(std::memory_order_acquire);
-    const auto& pan = tab_pan();
+    const auto& pan = tab_pan_;
+    bool ran = false;
     for (int r = 0; r < routed_by_slot_count_; ++r) {
         const int s = routed_by_slot_[r];
         const int k = compact_[s];
@@ -344,12 +375,16 @@ void Mixer::effect_stage(float* out, int frames, TMOD& m) {
                 m.efxc[s] = static_cast<int16_t>(-m.efxc[s]);
             }
         }
-        if (units_) units_->run(s, slots_.efxtype[s], send, out, frames, control_[s], el, er);
+        if (units_) {
+            units_->run(s, slots_.efxtype[s], send, out, frames, control_[s], el, er);
+            ran = true;
+        }
     }
+    return ran;
 }
 
-void Mixer::output_stage(float* out, int frames, const AudioFormat& format) {
-    const Peaks peaks = headroom_and_clip(out, frames);
+void Mixer::output_stage(float* out, int frames, const AudioFormat& format, bool silent) {
+    const Peaks peaks = silent ? Peaks{0, 0} : headroom_and_clip(out, frames);
     lmax.store(peaks.left, std::memory_order_relaxed);
     rmax.store(peaks.right, std::memory_order_relaxed);
     if (f_fftmode.load(std::memory_order_relaxed) == 1)

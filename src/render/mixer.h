@@ -7,6 +7,7 @@
 #include "render/audio_format.h"
 #include "render/effect_processor.h"
 #include "render/output_taps.h"
+#include "render/voice_mix.h"
 #include "song/effect_slots.h"
 #include "song/song_bank.h"
 
@@ -52,16 +53,33 @@ public:
     double tick_frames() const;
 
 private:
+    // What every voice of a piece shares, read once a piece rather than once a voice.
+    struct PieceSettings {
+        double frame_rate;
+        double pitch_factor;  // the global pitch's effect on every step; 1 at 128
+        bool interpolate;     // "Interpolation" chosen for every sample
+        float master;         // globalvol / 64
+        int mode;             // pan mode
+        int sends_ready;      // send buffers the audio thread may write
+    };
+
     void render_call(float* out, int frames, const AudioFormat& format);
     void number_routed_slots(const TMOD& m);
     void render_piece(float* out, int c0, int n, const TMOD& m, double frame_rate);
-    void render_voice(int vi, float* out, int c0, int n, const TMOD& m, double frame_rate);
-    void effect_stage(float* out, int frames, TMOD& m);
-    void output_stage(float* out, int frames, const AudioFormat& format);
+    void render_voice(int vi, float* out, int c0, int n, const TMOD& m, const PieceSettings& piece);
+    // Runs the routed slots' units; true when one ran (and may have added sound).
+    bool effect_stage(float* out, int frames, TMOD& m);
+    // Headroom and clip (skipped for a buffer known to be silent), then the output taps.
+    void output_stage(float* out, int frames, const AudioFormat& format, bool silent);
 
     SongBank& bank_;
     EffectSlots& slots_;
     Player& player_;
+    const std::array<float, 128>& tab_pan_;
+    const std::array<float, 128>& floatnote_;
+    // The mix loops this CPU runs, picked once: [16-bit][interpolated][SendMode][OutMode].
+    MonoMixFn mono_loops_[2][2][3][2]{};
+    StereoMixFn stereo_loops_[2][2]{};  // [16-bit][OutMode]
     EffectProcessor* units_ = nullptr;
     OutputRecorder* recorder_ = nullptr;
     MonitorRing* monitor_ring_ = nullptr;
