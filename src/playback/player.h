@@ -32,6 +32,8 @@ public:
 
     Transport tr;
     EditCursor cursor;
+    // The voice list: written by the sequencer (notes) and the mixer (positions), both on
+    // the audio thread while it runs; stop clears it (through the audio thread when it runs).
     std::array<Voice, kVoices> nlist{};
     // A bit per voice that may be active, so the mixer need not look at all 256: set when
     // a voice starts, cleared by the mixer when it finds the voice stopped.
@@ -40,14 +42,14 @@ public:
         nlist[voice].active = 1;
         active_hint[voice / 64] |= uint64_t{1} << (voice % 64);
     }
-    std::array<int16_t, kVoices> polytotrack{};
-    std::array<int16_t, kVoices> polytour{};
-    std::array<int16_t, kTracks> efxaffiche{};
-    std::array<int16_t, kEffectSlots> autovar{};  // the mixer's auto-pan positions
-    std::atomic<MidiOut*> papi{nullptr};
-    SpscQueue<64> to_window;              // from the audio thread
-    std::vector<Message> window_posts;    // from the window thread itself
-    const char* status = kStatusStopped;  // the status line
+    std::array<int16_t, kVoices> polytotrack{};   // track 0..63 owning each voice (track_to_poly)
+    std::array<int16_t, kVoices> polytour{};      // per track: the next of its voices, 0..nbvoice - 1
+    std::array<int16_t, kTracks> efxaffiche{};    // slot shown on each track's effect button (command 33)
+    std::array<int16_t, kEffectSlots> autovar{};  // the mixer's auto-pan positions, 0..255; efxa at start
+    std::atomic<MidiOut*> papi{nullptr};          // the open MIDI output, null when none
+    SpscQueue<64> to_window;                      // messages from the audio thread ('stop')
+    std::vector<Message> window_posts;            // messages from the window thread itself ('acti')
+    const char* status = kStatusStopped;          // the status line
     // Set by the audio driver while its callback may run: stopping then hands the voice
     // reset to the audio thread instead of doing it here.
     std::atomic<bool> audio_running{false};

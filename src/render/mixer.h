@@ -22,23 +22,23 @@ public:
     Mixer(SongBank& bank, EffectSlots& slots, Player& player);
 
     // Options ("Tempo", "Sound Quality", global pitch, mute) and the analyser switch.
-    std::atomic<uint8_t> ftemp{1};
-    std::atomic<int16_t> qual{0};
-    std::atomic<int16_t> valpitch{128};
-    std::array<std::atomic<uint8_t>, kTracks> mute{};
-    std::atomic<int16_t> f_fftmode{0};
-    std::atomic<uint8_t> frecmusic{0};
-    std::atomic<uint8_t> record_to_file{0};
-    std::atomic<uint8_t> monitor{0};
-    std::atomic<bool> measure_load{true};  // powermusic; offline renders have no deadline to meet
+    std::atomic<uint8_t> ftemp{1};       // "Tempo": 1 = a sequencer step per half-tick, 0 = per buffer
+    std::atomic<int16_t> qual{0};        // "Sound Quality": 0 "Normal", 1 "Interpolation"
+    std::atomic<int16_t> valpitch{128};  // global pitch, 1..255, 128 = normal
+    std::array<std::atomic<uint8_t>, kTracks> mute{};  // non-zero: the track is not heard
+    std::atomic<int16_t> f_fftmode{0};                 // 1: the analyser takes the output (Bufferfft1)
+    std::atomic<uint8_t> frecmusic{0};                 // 1: the song's own output is being recorded
+    std::atomic<uint8_t> record_to_file{0};            // 1: that recording goes to the recorder tap
+    std::atomic<uint8_t> monitor{0};                   // 1: the monitored input is mixed into the output
+    std::atomic<bool> measure_load{true};              // powermusic; offline renders have no deadline to meet
 
     // Meters and counters, read by the window thread.
-    std::atomic<float> lmax{0};
-    std::atomic<float> rmax{0};
-    std::atomic<float> powermusic{0};
-    std::atomic<uint32_t> nbpass{0};
-    std::atomic<uint32_t> pass{0};
-    std::array<std::atomic<double>, 512> Bufferfft1{};
+    std::atomic<float> lmax{0};        // peak of the left channel in the last buffer, 0..1
+    std::atomic<float> rmax{0};        // peak of the right channel
+    std::atomic<float> powermusic{0};  // time spent over the buffer's duration (1 = all of it)
+    std::atomic<uint32_t> nbpass{0};   // render calls so far
+    std::atomic<uint32_t> pass{0};     // effect stages run so far
+    std::array<std::atomic<double>, 512> Bufferfft1{};  // mono copy of the output for the analyser
 
     double bpmreste = 0;  // frames of the current tick still owed; audio thread only
 

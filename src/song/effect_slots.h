@@ -20,15 +20,20 @@ inline constexpr uint32_t kMaxEchoFrames = 441000;  // 10 s: bound for lengths f
 struct EffectSlots {
     EffectSlots();
 
+    // Unit type of each slot 0..99 (1, 2, 3, 5, 9, 10, 11, 12, 16, 17; 0 = none): slots 1..19
+    // hold the basic units at their own number, 20..99 the clones ("Clone efx", the "efx."
+    // chunk); written by the rack and the native reader, read by the mixer and command 33.
     std::array<int16_t, kEffectSlots> efxtype{};
-    // Serial number of each effect buffer a loaded song names (0 = none), and their count.
+    // Serial number (1, 2...) the native reader gives each effect buffer a song names,
+    // 0 = none, and how many it numbered.
     std::array<int16_t, kEffectSlots> bufnumber{};
     int nbbufferefx = 0;
-    // Send buffers by compact number - 1, 20480 bytes each, never freed once made. The
-    // audio thread uses only the first nsendbuffers of them.
+    // Send buffers by compact number - 1, 20480 bytes (kSendBufferFloats floats) each, never
+    // freed once made; the mixer sums the voices of a routed slot into one per piece.
     std::array<std::unique_ptr<float[]>, kEffectSlots> pbufferefx;
-    std::atomic<int> nsendbuffers{0};
-    // Echo lines by echo unit: 4 x length + 1024 bytes.
+    std::atomic<int> nsendbuffers{0};  // how many of them exist: the audio thread uses no more
+    // Echo lines by echo instance, 4 x length + 1024 bytes, and their sizes in bytes;
+    // replaced under the structure lock, run by the echo unit on the audio thread.
     std::array<std::unique_ptr<float[]>, kEchoUnits> echoefx;
     std::array<uint32_t, kEchoUnits> sizeecho{};
 

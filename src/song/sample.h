@@ -12,38 +12,39 @@ inline constexpr size_t kSampleSlack = 256;  // zero bytes after the data for in
 inline constexpr uint32_t kMaxSampleBytes = 64u << 20;
 
 // The sample record: this header, then the data, then kSampleSlack zero bytes, in one
-// allocation (see make_sample).
+// allocation (see make_sample). Filled by the module readers and by the sound importer
+// (loadsnd), both starting from Raz_data's values (after the last ';' of a comment);
+// read by the sequencer (volume, finetune, marks) and the mixer (everything it plays).
 struct p_s {
-    uint32_t rate;
-    uint8_t* data;       // null when the sample is empty
-    uint32_t length;     // bytes
-    uint32_t loopstart;  // bytes
-    uint32_t loopend;    // bytes
-    int16_t loopon;
-    int16_t refnote;
-    uint8_t spare[4];
-    char name[32];
-    int16_t volume;  // 0..128
-    int16_t bits;    // 8 or 16
-    uint8_t stereo;
-    uint8_t flag2;      // bit 0: always interpolate
-    int16_t framecode;  // log2 of bytes per frame
-    int16_t range1[2];
-    int16_t range2[2];
-    uint16_t envelope[kEnvelopePoints * kEnvelopeKinds];  // point-major: [point * 5 + kind]
-    uint16_t flagword;                                    // envelope enable bits
-    int16_t range3[2];
-    int16_t level;
-    int16_t finetune;
-    uint32_t setting;
-    uint16_t flag;
-    // Kept from an imported sound file: where its data began, the importer's default
-    // words, half its rate, and the file it came from.
-    uint32_t source_offset;
-    uint16_t default_words[4];
-    uint32_t halfrate;
-    uint16_t trailing;
-    char source_path[256];
+    uint32_t rate;       // frames per second of the data (8363 for MOD samples); 0
+    uint8_t* data;       // the bytes after this header; null when the sample is empty
+    uint32_t length;     // data length in bytes
+    uint32_t loopstart;  // loop start in bytes
+    uint32_t loopend;    // loop end in bytes; the mixer loops from loopstart to here
+    int16_t loopon;      // non-zero: the data loops between loopstart and loopend; 0
+    int16_t refnote;     // note (index of floatnote) that plays the data at its own rate; 72
+    uint8_t spare[4];    // unused, kept for the record's layout
+    char name[32];       // the sound's name, NUL-terminated; "None" when a file gives none
+    int16_t volume;      // default volume of a note, 0..128 (a file's 0..64 doubled)
+    int16_t bits;        // bits per sample value: 8 (signed) or 16 (signed, native order)
+    uint8_t stereo;      // 1: frames are interleaved left, right pairs; 0
+    uint8_t flag2;       // bit 0: always interpolate this sound, whatever "Sound Quality" says
+    int16_t framecode;   // log2 of bytes per frame, 0..2: byte counts >> framecode = frame counts
+    int16_t range1[2];   // lowest and highest note of the first key range; 0, 127
+    int16_t range2[2];   // lowest and highest note of the second key range; 0, 127
+    uint16_t envelope[kEnvelopePoints * kEnvelopeKinds];  // [point x 5 + kind] = position << 8 | level
+    uint16_t flagword;  // envelope enable bits: 1 volume, 2 send, 4 pan, 8 pitch, 16 fade; 0
+    int16_t range3[2];  // a third low and high note pair; 0, 127
+    int16_t level;      // a level word kept and saved with the sound; 64
+    int16_t finetune;   // finetune of a note, 0..15 (15 and 0 = none, see finetune_factor); 0
+    uint32_t setting;   // length over which the fade envelope runs, in frames after release; 102400
+    uint16_t flag;      // a flag word kept with the record; 0
+    // Kept from an imported sound file (loadsnd), shown by "info" and read by nothing else:
+    uint32_t source_offset;     // where the data began in the file
+    uint16_t default_words[4];  // the importer's fixed words 0, 127, 128, 0
+    uint32_t halfrate;          // rate >> 1
+    uint16_t trailing;          // 0
+    char source_path[256];      // the file the sound came from, NUL-terminated
 
     uint16_t& env(int kind, int point) { return envelope[point * kEnvelopeKinds + kind]; }
     uint16_t env(int kind, int point) const { return envelope[point * kEnvelopeKinds + kind]; }

@@ -30,13 +30,15 @@ public:
     SongBank(const SongBank&) = delete;
     SongBank& operator=(const SongBank&) = delete;
 
-    std::array<std::unique_ptr<TMOD>, kMaxSongs> timod;
-    int16_t nbimod = 0;
-    int16_t noimod = 0;
-    uint8_t fmulload = 0;
-    std::vector<PatternRef> p_pat;   // nbimod x 128
-    std::vector<SampleRef> t_sound;  // nbimod x 128
-    std::atomic<int16_t> nbvoie{0};  // read by the sequencer on the audio thread
+    // The tables below are written on the window thread (readers, editors, song commands),
+    // structural changes under the structure lock; the audio thread reads them.
+    std::array<std::unique_ptr<TMOD>, kMaxSongs> timod;  // the songs, by song number; null past nbimod
+    int16_t nbimod = 0;                                  // songs in memory, 1..63
+    int16_t noimod = 0;                                  // number of the current song, 0..nbimod - 1
+    uint8_t fmulload = 0;            // "Multiple Music Loading": 1 = a load adds a song instead of replacing
+    std::vector<PatternRef> p_pat;   // patterns: entry song x 128 + pattern; null = none (nbimod x 128)
+    std::vector<SampleRef> t_sound;  // sounds: entry song x 128 + sound - 1; null = empty (nbimod x 128)
+    std::atomic<int16_t> nbvoie{0};  // tracks read per row and allocated in every pattern, 0..64
     // Set while a whole song is swapped in; the render callback then renders silence.
     std::atomic<uint8_t> loadin{0};
     // The sample being replaced (local number), 65535 for none; voices on it are skipped.
