@@ -38,9 +38,10 @@ struct EditRange {
 };
 
 // Which fields a search looks at, each a value or "any"; a replacement writes the fields
-// it holds and leaves the others.
+// it holds and leaves the others. Fields start "any", so CellMask{.instrument = 3} names one.
 struct CellMask {
-    std::optional<uint8_t> note, volume, instrument, command, parameter;
+    std::optional<uint8_t> note = std::nullopt, volume = std::nullopt, instrument = std::nullopt,
+                           command = std::nullopt, parameter = std::nullopt;
     bool matches(const TNOTE& cell) const;
     void apply_to(TNOTE& cell) const;
     bool any_field() const { return note || volume || instrument || command || parameter; }

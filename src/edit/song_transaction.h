@@ -26,6 +26,8 @@ public:
     // The record to change. At commit only the bytes the edit changed are written over
     // the live record, so values the sequencer set meanwhile (speed, tempo...) are kept.
     TMOD& record();
+    // The record as the edit leaves it so far (copy or live), for reading.
+    const TMOD& view_record() const { return record_ ? *record_ : live(); }
     // The pattern with local number local, to change; null when the song has none there.
     Pattern* pattern(int local);
     // The pattern as the edit leaves it so far (copy or live), for reading; may be null.

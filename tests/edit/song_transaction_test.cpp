@@ -4,39 +4,13 @@
 
 #include <gtest/gtest.h>
 
-#include <cstring>
-
 #include "edit/edit_history.h"
-#include "engine/engine.h"
+#include "edit/song_fixture.h"
 
 namespace ondrel {
 namespace {
 
-// The song as bytes: record, patterns and samples, for exact comparisons.
-std::vector<uint8_t> song_bytes(const SongBank& bank) {
-    std::vector<uint8_t> out;
-    const TMOD& m = bank.current();
-    TMOD copy;
-    std::memcpy(static_cast<void*>(&copy), &m, sizeof m);
-    const auto* r = reinterpret_cast<const uint8_t*>(&copy);
-    out.insert(out.end(), r, r + sizeof copy);
-    for (int p = 0; p < kPatternsPerSong; ++p) {
-        const Pattern* pat = bank.song_pattern(p);
-        out.push_back(pat ? 1 : 0);
-        if (!pat) continue;
-        for (int t = 0; t < kTracks; ++t)
-            if (const TNOTE* c = pat->column(t)) {
-                const auto* b = reinterpret_cast<const uint8_t*>(c);
-                out.insert(out.end(), b, b + sizeof(TNOTE) * size_t(pat->nrows));
-            }
-    }
-    for (int s = 0; s < kSamplesPerSong; ++s) {
-        const p_s* smp = bank.song_sample(s);
-        out.push_back(smp ? 1 : 0);
-        if (smp && smp->data) out.insert(out.end(), smp->data, smp->data + smp->length);
-    }
-    return out;
-}
+using test::song_bytes;
 
 TEST(SongTransaction, UndoAndRedoRestoreEveryKindOfChangeExactly) {
     Engine engine;
