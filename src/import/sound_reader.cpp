@@ -286,13 +286,7 @@ LoadResult loadsnd(const std::string& path, const std::string& mime, SongBank& b
     }
     SampleRef sample;
     if (!read_sound_file(path, mime, sample, result.error)) return result;
-    const int global = bank.current().sndbase + slot;
-    bank.loadininst.store(static_cast<uint16_t>(slot), std::memory_order_relaxed);
-    {
-        std::lock_guard<StructureLock> guard(bank.structure_lock());
-        bank.t_sound[static_cast<size_t>(global)].swap(sample);
-    }
-    bank.loadininst.store(65535, std::memory_order_relaxed);
+    bank.replace_sound(slot, sample);
     result.ok = true;
     result.song = bank.noimod;
     return result;

@@ -401,11 +401,13 @@ void Mixer::output_stage(float* out, int frames, const AudioFormat& format, bool
         // Added after the clip and the meters: the monitored input is neither.
         MonitorRing& ring = *monitor_ring_;
         constexpr size_t kValues = MonitorRing::kBytes / 2;
+        size_t read = ring.read.load(std::memory_order_relaxed);
         for (int i = 0; i < frames; ++i) {
-            out[2 * i] += ring.ring[ring.read % kValues].load(std::memory_order_relaxed) / 32768.0f;
-            out[2 * i + 1] += ring.ring[(ring.read + 1) % kValues].load(std::memory_order_relaxed) / 32768.0f;
-            ring.read = (ring.read + 2) % kValues;
+            out[2 * i] += ring.ring[read % kValues].load(std::memory_order_relaxed) / 32768.0f;
+            out[2 * i + 1] += ring.ring[(read + 1) % kValues].load(std::memory_order_relaxed) / 32768.0f;
+            read = (read + 2) % kValues;
         }
+        ring.read.store(read, std::memory_order_relaxed);
     }
 }
 

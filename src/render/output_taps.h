@@ -21,7 +21,8 @@ public:
 struct MonitorRing {
     static constexpr size_t kBytes = 16384;
     std::array<std::atomic<int16_t>, kBytes / 2> ring{};
-    size_t read = 0;  // in 16-bit values; the mixer's own
+    // In 16-bit values; the mixer's, except that starting to monitor sets where it reads.
+    std::atomic<size_t> read{0};
 };
 
 }  // namespace ondrel

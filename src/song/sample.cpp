@@ -12,15 +12,26 @@ void SampleFree::operator()(p_s* s) const {
     ::operator delete (static_cast<void*>(s), std::align_val_t{alignof(std::max_align_t)});
 }
 
-SampleRef make_sample(uint32_t length) {
-    const size_t bytes = sizeof(p_s) + size_t{length} + kSampleSlack;
-    void* raw = ::operator new (bytes, std::align_val_t{alignof(std::max_align_t)});
-    std::memset(raw, 0, bytes);
-    auto* s = new (raw) p_s{};
-    Raz_data(*s);
+void SampleBlockFree::operator()(uint8_t* block) const {
+    ::operator delete (static_cast<void*>(block), std::align_val_t{alignof(std::max_align_t)});
+}
+
+SampleBlock make_sample_block(size_t bytes) {
+    void* raw = ::operator new (std::max(bytes, sizeof(p_s)), std::align_val_t{alignof(std::max_align_t)});
+    std::memset(raw, 0, std::max(bytes, sizeof(p_s)));
+    return SampleBlock(static_cast<uint8_t*>(raw));
+}
+
+SampleRef sample_in_place(SampleBlock block, uint32_t length) {
+    auto* s = new (block.release()) p_s{};
     s->data = reinterpret_cast<uint8_t*>(s) + sizeof(p_s);
     s->length = length;
+    Raz_data(*s);
     return SampleRef(s);
+}
+
+SampleRef make_sample(uint32_t length) {
+    return sample_in_place(make_sample_block(sizeof(p_s) + size_t{length} + kSampleSlack), length);
 }
 
 void Raz_data(p_s& s) {

@@ -60,6 +60,19 @@ using SampleRef = std::unique_ptr<p_s, SampleFree>;
 // header (Raz_data), and points data at the bytes after the header.
 SampleRef make_sample(uint32_t length);
 
+// Zero-filled memory from the allocator sample records come from, for a recorder that fills
+// it first and makes it a record afterwards (sample_in_place).
+struct SampleBlockFree {
+    void operator()(uint8_t* block) const;
+};
+using SampleBlock = std::unique_ptr<uint8_t, SampleBlockFree>;
+SampleBlock make_sample_block(size_t bytes);
+
+// Makes a block a record where it lies: a reset header written over its first bytes, the
+// data just after the header, length bytes long. The block must hold the header, length
+// bytes and the slack.
+SampleRef sample_in_place(SampleBlock block, uint32_t length);
+
 // Resets the header to the reset values, leaving data and length to the caller.
 void Raz_data(p_s& s);
 

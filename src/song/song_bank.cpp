@@ -106,6 +106,18 @@ void SongBank::Raz_data(int sample) {
     if (p_s* s = this->sample(sample)) ondrel::Raz_data(*s);
 }
 
+void SongBank::replace_sound(int slot, SampleRef& sample) {
+    if (slot < 0 || slot >= kSamplesPerSong) return;
+    const size_t global = static_cast<size_t>(current().sndbase + slot);
+    if (global >= t_sound.size()) return;
+    loadininst.store(static_cast<uint16_t>(slot), std::memory_order_relaxed);
+    {
+        std::lock_guard<StructureLock> guard(*lock_);
+        t_sound[global].swap(sample);
+    }
+    loadininst.store(65535, std::memory_order_relaxed);
+}
+
 void SongBank::updatenbvoice(short tracks) {
     if (tracks <= nbvoie) return;
     tracks = std::min<short>(tracks, kTracks);

@@ -69,7 +69,9 @@ public:
     void killmusic();
     // Makes song current.
     void select(int song);
-    // Resets the header of a sample that exists, with the render callback kept off it.
+    // Puts sample into sound slot (0-based) of the current song, the render callback kept
+    // off that slot meanwhile; sample comes back holding the record the slot had.
+    void replace_sound(int slot, SampleRef& sample);
 
     // Replaces song's record, patterns and samples with data (whose base indices are
     // rewritten for the slot), under the structure lock; the old ones are freed after.
