@@ -92,6 +92,7 @@ int create_temporary(const std::string& target, std::string& name) {
 bool OutputFile::open(const std::string& path, std::string& why) {
     abandon();
     error_.clear();
+    error_number_ = 0;
     written_ = base_ = 0;
     seekable_ = false;
     buffer_.resize(kBufferBytes);
@@ -103,17 +104,20 @@ bool OutputFile::open(const std::string& path, std::string& why) {
     std::string target;
     int err = 0;
     if (!follow_links(path, target, err)) {
+        error_number_ = err;
         why = "cannot write " + path + ": " + reason(err);
         return false;
     }
     struct stat st {};
     if (::stat(target.c_str(), &st) == 0) {
         if (S_ISDIR(st.st_mode)) {
+            error_number_ = EISDIR;
             why = "cannot write " + path + ": " + reason(EISDIR);
             return false;
         }
         if (!S_ISREG(st.st_mode)) return open_in_place(target, false, why);
     } else if (errno != ENOENT) {
+        error_number_ = errno;
         why = "cannot write " + path + ": " + reason(errno);
         return false;
     }
@@ -127,10 +131,12 @@ bool OutputFile::open_replacement(const std::string& target, std::string& why) {
         // Root may write anything; like an editor, we still take a file that nobody may
         // write as one not to be replaced.
         if ((st.st_mode & 0222) == 0) {
+            error_number_ = EACCES;
             why = "cannot write " + shown_ + ": the file is read-only";
             return false;
         }
         if (::faccessat(AT_FDCWD, target.c_str(), W_OK, AT_EACCESS) != 0) {
+            error_number_ = errno;
             why = "cannot write " + shown_ + ": " + reason(errno);
             return false;
         }
@@ -138,6 +144,7 @@ bool OutputFile::open_replacement(const std::string& target, std::string& why) {
     std::string temp;
     const int fd = create_temporary(target, temp);
     if (fd < 0) {
+        error_number_ = errno;
         why = "cannot write in " + folder_of(target) + ": " + reason(errno);
         return false;
     }
@@ -158,6 +165,7 @@ bool OutputFile::open_replacement(const std::string& target, std::string& why) {
 bool OutputFile::open_in_place(const std::string& target, bool is_stdout, std::string& why) {
     if (is_stdout) {
         if (::isatty(STDOUT_FILENO)) {
+            error_number_ = ENOTTY;
             why = "cannot write to standard output: it is a terminal";
             return false;
         }
@@ -170,6 +178,7 @@ bool OutputFile::open_in_place(const std::string& target, bool is_stdout, std::s
     }
     struct stat st {};
     if (fd_ < 0 || ::fstat(fd_, &st) != 0) {
+        error_number_ = errno;
         why = "cannot write " + shown_ + ": " + reason(errno);
         close_fd();
         return false;
@@ -184,7 +193,10 @@ bool OutputFile::open_in_place(const std::string& target, bool is_stdout, std::s
 }
 
 bool OutputFile::fail(const std::string& what, int err) {
-    if (error_.empty()) error_ = what + " " + shown_ + ": " + reason(err);
+    if (error_.empty()) {
+        error_ = what + " " + shown_ + ": " + reason(err);
+        error_number_ = err;
+    }
     return false;
 }
 
@@ -196,6 +208,7 @@ bool OutputFile::flush() {
         const ssize_t n = ::write(fd_, p, left);
         if (n < 0) {
             if (errno == EINTR) continue;
+            buffered_ = 0;  // what did not reach the file is not counted as written
             return fail("cannot write", errno);
         }
         p += n;
@@ -233,6 +246,18 @@ bool OutputFile::rewrite(uint64_t offset, const void* data, size_t bytes) {
         offset += static_cast<uint64_t>(n);
         bytes -= static_cast<size_t>(n);
     }
+    return true;
+}
+
+bool OutputFile::keep_first(uint64_t length) {
+    if (fd_ < 0 || !seekable_ || length > written_) return false;
+    buffered_ = 0;
+    if (::ftruncate(fd_, static_cast<off_t>(base_ + length)) != 0 ||
+        ::lseek(fd_, static_cast<off_t>(base_ + length), SEEK_SET) < 0)
+        return fail("cannot write", errno);
+    written_ = length;
+    error_.clear();
+    error_number_ = 0;
     return true;
 }
 

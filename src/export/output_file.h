@@ -34,7 +34,12 @@ public:
     // Overwrites bytes at an offset from the start of what this file wrote (a header
     // patched when a recording stops); false on a stream or after an error.
     bool rewrite(uint64_t offset, const void* data, size_t bytes);
+    // After a failed write, only what reached the destination.
     uint64_t bytes_written() const { return written_ + buffered_; }
+    // Keeps the first length bytes of what reached the file and forgets a write error, so
+    // that what was written before a failure (a disk that filled up) can still be finished
+    // and committed; false on a stream, or when length is more than was written.
+    bool keep_first(uint64_t length);
 
     // Flushes everything and puts the file in place; false with why set, and then a regular
     // target is left as it was.
@@ -44,6 +49,8 @@ public:
 
     // The first failure, as one line; empty while all is well.
     const std::string& error() const { return error_; }
+    // Its errno (an open refused for the file's permissions counts as EACCES); 0 when none.
+    int error_number() const { return error_number_; }
 
 private:
     bool open_replacement(const std::string& target, std::string& why);
@@ -63,6 +70,7 @@ private:
     std::string target_;  // the file the rename lands on
     std::string temp_;    // our temporary file, while there is one
     std::string error_;
+    int error_number_ = 0;
 };
 
 // Writes a whole file by the rules above; false with why set.
