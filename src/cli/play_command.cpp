@@ -1,6 +1,5 @@
 #include <algorithm>
 #include <chrono>
-#include <csignal>
 #include <cstdio>
 #include <iostream>
 #include <mutex>
@@ -8,6 +7,7 @@
 
 #include "cli/cli_load.h"
 #include "cli/commands.h"
+#include "cli/console.h"
 #include "cli/sound_options.h"
 #include "cli/terminal_keys.h"
 #include "platform/sdl_audio_output.h"
@@ -15,11 +15,6 @@
 namespace ondrel {
 
 namespace {
-
-volatile std::sig_atomic_t interrupted = 0;
-void on_interrupt(int) {
-    interrupted = 1;
-}
 
 void play_usage(std::ostream& out) {
     out << "usage: ondrel play FILE [options]\n"
@@ -31,20 +26,14 @@ void play_usage(std::ostream& out) {
         << "Exit status 3 means no sound device could be opened ('ondrel render' works without one).\n";
 }
 
-std::string meter(float level) {
-    const int width = 12;
-    const int n = std::clamp(static_cast<int>(level * width + 0.5f), 0, width);
-    return std::string(static_cast<size_t>(n), '#') + std::string(static_cast<size_t>(width - n), '-');
-}
-
 void show_status(const Engine& e, double seconds) {
     const TMOD& m = e.bank.current();
     const int pos = e.player.tr.nopat;
     std::fprintf(stderr, "\r%-15s pos %3d/%-3d pat %3d row %3d/%-3d %3d:%02d  L %s R %s  load %3.0f%% ",
                  e.player.status, pos, m.nbpos, m.sequence[std::clamp(pos, 0, 255)], e.player.tr.nopos.load(),
                  m.rows[m.sequence[std::clamp(pos, 0, 255)]], static_cast<int>(seconds) / 60,
-                 static_cast<int>(seconds) % 60, meter(e.mixer.lmax).c_str(), meter(e.mixer.rmax).c_str(),
-                 e.mixer.powermusic * 100.0);
+                 static_cast<int>(seconds) % 60, level_meter(e.mixer.lmax, 12).c_str(),
+                 level_meter(e.mixer.rmax, 12).c_str(), e.mixer.powermusic * 100.0);
     std::fflush(stderr);
 }
 
@@ -88,8 +77,7 @@ int cmd_play(const Args& args) {
         std::cerr << "ondrel: " << why << "\n";
         return kExitNoDevice;
     }
-    std::signal(SIGINT, on_interrupt);
-    std::signal(SIGTERM, on_interrupt);
+    StopRequests stop_requests;
     const bool status = is_terminal(2);
     TerminalKeys keys;
     player.start(false);
@@ -104,7 +92,7 @@ int cmd_play(const Args& args) {
         while (player.to_window.pop(msg)) {
         }
         const int key = keys.poll();
-        if (key == 'q' || key == 'Q' || key == 27 || interrupted) {
+        if (key == 'q' || key == 'Q' || key == 27 || stop_requests.asked()) {
             ended = "your request";
             break;
         }
@@ -124,8 +112,6 @@ int cmd_play(const Args& args) {
     }
     player.stoppi();
     output.close();
-    std::signal(SIGINT, SIG_DFL);
-    std::signal(SIGTERM, SIG_DFL);
     if (status) std::fprintf(stderr, "\n");
     std::fprintf(stderr, "stopped at %s (sound driver: %s)\n", ended, output.driver());
     return kExitOk;

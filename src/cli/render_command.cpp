@@ -5,6 +5,7 @@
 
 #include "cli/cli_load.h"
 #include "cli/commands.h"
+#include "cli/song_output_args.h"
 #include "cli/sound_options.h"
 #include "export/wav_writer.h"
 #include "render/offline_render.h"
@@ -39,37 +40,19 @@ void show_progress(const Player& player, const TMOD& song, double seconds) {
 }  // namespace
 
 int cmd_render(const Args& args) {
-    std::string in, out, error;
-    bool as_float = false, quiet = false;
-    SoundOptions sound;
-    for (size_t i = 0; i < args.size() && error.empty(); ++i) {
-        const std::string& a = args[i];
-        if (a == "-h" || a == "--help") {
-            render_usage(std::cout);
-            return kExitOk;
-        } else if (a == "-o" && i + 1 < args.size()) {
-            out = args[++i];
-        } else if (a == "--float") {
-            as_float = true;
-        } else if (a == "--quiet") {
-            quiet = true;
-        } else if (parse_sound_option(args, i, sound, error)) {
-        } else if (!a.empty() && a[0] != '-' && in.empty()) {
-            in = a;
-        } else {
-            error = "unexpected " + a;
-        }
-    }
-    if (error.empty() && (in.empty() || out.empty())) error = "a song and -o OUT.wav are needed";
-    if (!error.empty()) {
-        std::cerr << "ondrel render: " << error << "\n";
-        render_usage(std::cerr);
-        return kExitUsage;
-    }
-
+    SongOutputArgs parsed;
+    bool as_float = false;
+    const auto own_flag = [&](const std::string& a) {
+        if (a != "--float") return false;
+        as_float = true;
+        return true;
+    };
+    const int exit_code = parse_song_output_args(args, "render", "OUT.wav", render_usage, own_flag, parsed);
+    if (exit_code >= 0) return exit_code;
+    const std::string& out = parsed.out;
+    const bool quiet = parsed.quiet;
     Engine engine;
-    if (!load_for_cli(engine, in)) return kExitFailed;
-    apply_sound_options(sound, engine);
+    if (!load_song_with_options(parsed, engine)) return kExitFailed;
     WavWriter wav;
     std::string why;
     if (!wav.open(out, 2, 44100, as_float ? WavSampleFormat::Float32 : WavSampleFormat::Pcm16, why)) {
@@ -80,17 +63,17 @@ int cmd_render(const Args& args) {
     const auto started = std::chrono::steady_clock::now();
     auto last_shown = started;
     const TMOD& song = engine.bank.current();
-    const RenderEnd end =
-        render_offline(engine.mixer, engine.player, OfflineOptions{sound.buffer_frames, sound.max_seconds},
-                       [&](const float* frames, int count, double seconds) {
-                           if (!wav.write(frames, static_cast<size_t>(count))) return false;
-                           const auto now = std::chrono::steady_clock::now();
-                           if (progress && now - last_shown > std::chrono::milliseconds(100)) {
-                               show_progress(engine.player, song, seconds);
-                               last_shown = now;
-                           }
-                           return true;
-                       });
+    const RenderEnd end = render_offline(
+        engine.mixer, engine.player, OfflineOptions{parsed.sound.buffer_frames, parsed.sound.max_seconds},
+        [&](const float* frames, int count, double seconds) {
+            if (!wav.write(frames, static_cast<size_t>(count))) return false;
+            const auto now = std::chrono::steady_clock::now();
+            if (progress && now - last_shown > std::chrono::milliseconds(100)) {
+                show_progress(engine.player, song, seconds);
+                last_shown = now;
+            }
+            return true;
+        });
     if (progress) std::fprintf(stderr, "\r%70s\r", "");
     if (end == RenderEnd::Aborted) why = wav.error();
     if (end == RenderEnd::Aborted || !wav.finish(why)) {

@@ -95,7 +95,9 @@ bool WavWriter::write(const float* samples, size_t frames) {
                     buffer[i] = static_cast<uint8_t>(std::lrintf(x * 127.0f) + 128);
                     break;
                 case WavSampleFormat::Pcm16: {
-                    const int16_t v = static_cast<int16_t>(std::lrintf(x * 32767.0f));
+                    // Truncated, as the mixer hands its output to the recorder: a song
+                    // rendered here and the same song recorded as it plays are the same.
+                    const auto v = static_cast<int16_t>(x * 32767);
                     buffer[2 * i] = static_cast<uint8_t>(v & 0xff);
                     buffer[2 * i + 1] = static_cast<uint8_t>((v >> 8) & 0xff);
                     break;

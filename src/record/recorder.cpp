@@ -222,7 +222,10 @@ void Recorder::store(const int16_t* in, size_t frames, double g, SpscQueue<16>& 
     }
     const uint64_t total = total_.load(std::memory_order_relaxed);
     const uint64_t cap = stop_after_.load(std::memory_order_relaxed);
-    if (cap && total >= cap) return;
+    if (cap && total >= cap) {
+        posts.push(Message{kMsgStre});
+        return;
+    }
     const size_t align = record_format(mode_).block_align;
     size_t n_frames = std::min<size_t>(frames, (kCaptureBlock - pos) / align);
     if (cap) n_frames = std::min<size_t>(n_frames, (cap - total) / align);

@@ -87,6 +87,7 @@ public:
     // For a command line: the hook stores no more than this many bytes (0: no limit) and
     // then asks to stop. Set before the recording starts, or from the hook's own thread.
     void stop_after_bytes(uint64_t bytes) { stop_after_.store(bytes, std::memory_order_release); }
+    uint64_t stop_after() const { return stop_after_.load(std::memory_order_acquire); }
 
     // The hook, from the mixer: the song's own output.
     void RecordFile(const int16_t* samples, size_t bytes, const AudioFormat& format) override;

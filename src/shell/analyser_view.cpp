@@ -19,9 +19,12 @@ int classic_bar_height(double x) {
     return static_cast<int>(std::lround(v * v * 128));
 }
 
-void draw_radar_row(const double* x, AnalyserPixels& pixels, int row) {
-    uint32_t* line = pixels.data() + static_cast<size_t>(row) * kAnalyserWidth;
+void radar_line(const double* x, uint32_t* line) {
     for (int i = 0; i < kAnalyserWidth; ++i) line[i] = radar_pixel(x[i]);
+}
+
+void draw_radar_row(const double* x, AnalyserPixels& pixels, int row) {
+    radar_line(x, pixels.data() + static_cast<size_t>(row) * kAnalyserWidth);
 }
 
 void draw_classic(const double* x, AnalyserPixels& pixels) {
@@ -52,9 +55,14 @@ void AnalyserView::Draw(const std::array<std::atomic<double>, 512>& block) {
     Draw(copy);
 }
 
-void AnalyserView::Draw(const double* block) {
+const std::array<double, 512>& AnalyserView::transform(const double* block) {
     std::copy(block, block + values_.size(), values_.begin());
     fft_.DirectFFT(values_.data());
+    return values_;
+}
+
+void AnalyserView::Draw(const double* block) {
+    transform(block);
     if (view_mode_ == kViewRadar) {
         draw_radar_row(values_.data(), pixels_, radar_row_);
         radar_row_ = radar_row_ >= kAnalyserHeight - 1 ? 0 : radar_row_ + 1;

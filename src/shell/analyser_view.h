@@ -25,7 +25,8 @@ uint32_t radar_pixel(double x);
 // Classic: the rows of the bar of a value, 0 to 128 (128 from 4.0 on, 8 for 1.0).
 int classic_bar_height(double x);
 
-// One radar row: column i shows x[i] of the 512 packed values.
+// One radar line of 512 pixels: column i shows x[i] of the 512 packed values.
+void radar_line(const double* x, uint32_t* line);
 void draw_radar_row(const double* x, AnalyserPixels& pixels, int row);
 // The bars: cleared, then column i filled from the bottom up to its height, the pixel of
 // row u coloured (2u, 2u, u).
@@ -46,6 +47,8 @@ public:
     // Copies the block (Bufferfft1, full scale 1.0), transforms it and draws.
     void Draw(const std::array<std::atomic<double>, 512>& block);
     void Draw(const double* block);
+    // The transform of a block, as Draw shows it.
+    const std::array<double, 512>& transform(const double* block);
     const AnalyserPixels& pixels() const { return pixels_; }
 
 private:

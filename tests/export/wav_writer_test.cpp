@@ -37,7 +37,7 @@ TEST(WavWriter, Pcm16HeaderAndSamples) {
     EXPECT_EQ(le16(b, 32), 4);
     EXPECT_EQ(le16(b, 34), 16);
     EXPECT_EQ(le32(b, 40), 12u);
-    const int16_t want[] = {0, 32767, -32767, 16384, 32767, -32767};  // clipped, rounded
+    const int16_t want[] = {0, 32767, -32767, 16383, 32767, -32767};  // clipped, truncated
     for (int i = 0; i < 6; ++i) EXPECT_EQ(static_cast<int16_t>(le16(b, 44 + 2 * i)), want[i]) << i;
 }
 

@@ -1,0 +1,22 @@
+#pragma once
+#include <string>
+
+namespace ondrel {
+
+// What the commands that run in real time share on the terminal.
+
+// A level from 0 to 1 as a bar of width characters: "####--------".
+std::string level_meter(double level, int width);
+
+// While it lives, Ctrl-C and a termination request ask the command to stop instead of
+// killing it, so that what it writes is finished properly.
+class StopRequests {
+public:
+    StopRequests();
+    ~StopRequests();
+    StopRequests(const StopRequests&) = delete;
+    StopRequests& operator=(const StopRequests&) = delete;
+    bool asked() const;
+};
+
+}  // namespace ondrel
