@@ -59,12 +59,43 @@ void cmd_mute_track(Program& p, const ShellMessage& m);
 void cmd_about(Program& p, const ShellMessage& m);
 void cmd_arrangement_follow(Program& p, const ShellMessage& m);
 void cmd_documentation(Program& p, const ShellMessage& m);
+void cmd_open_window(Program& p, const ShellMessage& m);
 
 // Editing that the shell itself does.
 void cmd_jump_step(Program& p, const ShellMessage& m);
 void cmd_cursor_to(Program& p, const ShellMessage& m);
+void cmd_mark_block(Program& p, const ShellMessage& m);
 void cmd_edit_mode(Program& p, const ShellMessage& m);
 void cmd_undo(Program& p, const ShellMessage& m);
 void cmd_redo(Program& p, const ShellMessage& m);
+
+// Pattern, track and block: clear, cut, copy, paste and paste-mix, transpose.
+void cmd_clear_cells(Program& p, const ShellMessage& m);
+void cmd_cut_cells(Program& p, const ShellMessage& m);
+void cmd_copy_cells(Program& p, const ShellMessage& m);
+void cmd_paste_cells(Program& p, const ShellMessage& m);
+void cmd_transpose(Program& p, const ShellMessage& m);
+
+// Positions and patterns of the sequence; removing sounds, sequence or everything.
+void cmd_next_position(Program& p, const ShellMessage& m);
+void cmd_previous_position(Program& p, const ShellMessage& m);
+void cmd_delete_position(Program& p, const ShellMessage& m);
+void cmd_insert_position(Program& p, const ShellMessage& m);
+void cmd_new_pattern(Program& p, const ShellMessage& m);
+void cmd_next_position_new_pattern(Program& p, const ShellMessage& m);
+void cmd_remove_pattern(Program& p, const ShellMessage& m);
+void cmd_remove_from_song(Program& p, const ShellMessage& m);
+
+// Settings of the song, its tracks, instruments and positions (the panes and windows).
+void cmd_song_setting(Program& p, const ShellMessage& m);
+void cmd_track_setting(Program& p, const ShellMessage& m);
+void cmd_instrument(Program& p, const ShellMessage& m);
+void cmd_arrangement(Program& p, const ShellMessage& m);
+
+// Searches.
+void cmd_find_next(Program& p, const ShellMessage& m);
+void cmd_replace_all(Program& p, const ShellMessage& m);
+void cmd_find_unused_instruments(Program& p, const ShellMessage& m);
+void cmd_find_current_instrument(Program& p, const ShellMessage& m);
 
 }  // namespace ondrel

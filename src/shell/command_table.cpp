@@ -17,6 +17,9 @@ bool can_undo(const Program& p) {
 bool can_redo(const Program& p) {
     return p.history().can_redo();
 }
+bool has_block(const Program& p) {
+    return p.editor.block.active;
+}
 bool has_sound(const Program& p) {
     const p_s* s = p.engine.bank.song_sample(p.engine.player.cursor.cursnd);
     return s && s->data && s->length;
@@ -39,23 +42,38 @@ const CommandInfo kCommands[] = {
     {fourcc("REDO"), "Redo", Menu::None, nullptr, ctrl_shift('z'), cmd_redo, can_redo},
     {fourcc("EDmd"), "Edit Mode", Menu::Edit, nullptr, plain(kKeySpace), cmd_edit_mode,
      nullptr, [](const Program& p) { return p.editor.edit_mode; }},
+    {fourcc("Bcut"), "Cut Block", Menu::Edit, "Block", alt('x'), cmd_cut_cells, has_block},
+    {fourcc("Bcpy"), "Copy Block", Menu::Edit, "Block", alt('c'), cmd_copy_cells, has_block},
+    {fourcc("Bcpy"), "Copy Block", Menu::None, nullptr, ctrl('c'), cmd_copy_cells, has_block},
+    {fourcc("Bpas"), "Paste Block", Menu::Edit, "Block", alt('v'), cmd_paste_cells},
+    {fourcc("Bmix"), "Paste Block, Empty Cells Only", Menu::Edit, "Block", alt('m'), cmd_paste_cells},
+    {fourcc("Bclr"), "Clear Block", Menu::Edit, "Block", alt(kKeyDelete), cmd_clear_cells, has_block},
+    {fourcc("XPsu"), "Semitone Up", Menu::Edit, "Transpose", ctrl(kKeyUp), cmd_transpose},
+    {fourcc("XPsd"), "Semitone Down", Menu::Edit, "Transpose", ctrl(kKeyDown), cmd_transpose},
+    {fourcc("XPou"), "Octave Up", Menu::Edit, "Transpose", ctrl_shift(kKeyUp), cmd_transpose},
+    {fourcc("XPod"), "Octave Down", Menu::Edit, "Transpose", ctrl_shift(kKeyDown), cmd_transpose},
+    {fourcc("XPdl"), "Transpose...", Menu::Edit, "Transpose", kNoKey, cmd_open_window},
+    {fourcc("XPrn"), "Transpose a range", Menu::None, nullptr, kNoKey, cmd_transpose},
+    {fourcc("Srch"), "Find and Replace...", Menu::Edit, nullptr, ctrl('f'), cmd_open_window},
+    {fourcc("Sfnd"), "Find Next", Menu::Edit, nullptr, plain(kKeyF1 + 2), cmd_find_next},
+    {fourcc("Srpl"), "Replace All", Menu::Edit, nullptr, kNoKey, cmd_replace_all},
     // Pattern and track
-    {fourcc("Pclr"), "Pattern Clear", Menu::Pattern, nullptr, kNoKey, nullptr},
-    {fourcc("Pcut"), "Pattern Cut", Menu::Pattern, nullptr, ctrl('x'), nullptr},
-    {fourcc("Pcpy"), "Pattern Copy", Menu::Pattern, nullptr, kNoKey, nullptr},
-    {fourcc("Ppas"), "Pattern Paste", Menu::Pattern, nullptr, ctrl('v'), nullptr},
-    {fourcc("Tclr"), "Track Clear", Menu::Pattern, nullptr, kNoKey, nullptr},
-    {fourcc("Tcut"), "Track Cut", Menu::Pattern, nullptr, ctrl_shift('x'), nullptr},
-    {fourcc("Tcpy"), "Track Copy", Menu::Pattern, nullptr, kNoKey, nullptr},
-    {fourcc("Tpas"), "Track Paste", Menu::Pattern, nullptr, ctrl_shift('v'), nullptr},
+    {fourcc("Pclr"), "Pattern Clear", Menu::Pattern, nullptr, kNoKey, cmd_clear_cells},
+    {fourcc("Pcut"), "Pattern Cut", Menu::Pattern, nullptr, ctrl('x'), cmd_cut_cells},
+    {fourcc("Pcpy"), "Pattern Copy", Menu::Pattern, nullptr, kNoKey, cmd_copy_cells},
+    {fourcc("Ppas"), "Pattern Paste", Menu::Pattern, nullptr, ctrl('v'), cmd_paste_cells},
+    {fourcc("Tclr"), "Track Clear", Menu::Pattern, nullptr, kNoKey, cmd_clear_cells},
+    {fourcc("Tcut"), "Track Cut", Menu::Pattern, nullptr, ctrl_shift('x'), cmd_cut_cells},
+    {fourcc("Tcpy"), "Track Copy", Menu::Pattern, nullptr, kNoKey, cmd_copy_cells},
+    {fourcc("Tpas"), "Track Paste", Menu::Pattern, nullptr, ctrl_shift('v'), cmd_paste_cells},
     // Positions
-    {fourcc("Tplu"), "Next Pos", Menu::Position, nullptr, kNoKey, nullptr},
-    {fourcc("Tmoi"), "Prev Pos", Menu::Position, nullptr, kNoKey, nullptr},
-    {fourcc("Tdel"), "Pos Delete", Menu::Position, nullptr, kNoKey, nullptr},
-    {fourcc("Tins"), "Pos Insert", Menu::Position, nullptr, kNoKey, nullptr},
-    {fourcc("Tnpt"), "New Pattern", Menu::Position, nullptr, kNoKey, nullptr},
-    {fourcc("Tppt"), "Next position & New Pattern", Menu::Position, nullptr, kNoKey, nullptr},
-    {fourcc("Trpt"), "Remove Pattern", Menu::Position, nullptr, kNoKey, nullptr},
+    {fourcc("Tplu"), "Next Pos", Menu::Position, nullptr, kNoKey, cmd_next_position},
+    {fourcc("Tmoi"), "Prev Pos", Menu::Position, nullptr, kNoKey, cmd_previous_position},
+    {fourcc("Tdel"), "Pos Delete", Menu::Position, nullptr, kNoKey, cmd_delete_position},
+    {fourcc("Tins"), "Pos Insert", Menu::Position, nullptr, kNoKey, cmd_insert_position},
+    {fourcc("Tnpt"), "New Pattern", Menu::Position, nullptr, kNoKey, cmd_new_pattern},
+    {fourcc("Tppt"), "Next position & New Pattern", Menu::Position, nullptr, kNoKey, cmd_next_position_new_pattern},
+    {fourcc("Trpt"), "Remove Pattern", Menu::Position, nullptr, kNoKey, cmd_remove_pattern},
     // Jump step
     {fourcc("J001"), "Jump 1 line", Menu::Pattern, "Jump", ctrl('1'), cmd_jump_step, nullptr,
      [](const Program& p) { return p.engine.player.cursor.jumpstep == 1; }},
@@ -74,15 +92,15 @@ const CommandInfo kCommands[] = {
     {fourcc("J008"), "Jump 8 lines", Menu::Pattern, "Jump", ctrl('8'), cmd_jump_step, nullptr,
      [](const Program& p) { return p.engine.player.cursor.jumpstep == 8; }},
     // Song-wide
-    {fourcc("Rsnd"), "Remove Sounds", Menu::Song, nullptr, kNoKey, nullptr},
-    {fourcc("Rseq"), "Remove Sequence", Menu::Song, nullptr, kNoKey, nullptr},
-    {fourcc("Rall"), "Remove All", Menu::Song, nullptr, kNoKey, nullptr},
-    {fourcc("FIIT"), "Find instruments not used in the music", Menu::Song, nullptr, kNoKey, nullptr},
-    {fourcc("CUIT"), "Find current instrument", Menu::Song, nullptr, kNoKey, nullptr},
+    {fourcc("Rsnd"), "Remove Sounds", Menu::Song, nullptr, kNoKey, cmd_remove_from_song},
+    {fourcc("Rseq"), "Remove Sequence", Menu::Song, nullptr, kNoKey, cmd_remove_from_song},
+    {fourcc("Rall"), "Remove All", Menu::Song, nullptr, kNoKey, cmd_remove_from_song},
+    {fourcc("FIIT"), "Find instruments not used in the music", Menu::Song, nullptr, kNoKey, cmd_find_unused_instruments},
+    {fourcc("CUIT"), "Find current instrument", Menu::Song, nullptr, kNoKey, cmd_find_current_instrument},
     // Windows
     {fourcc("wmed"), "Documentation", Menu::Windows, nullptr, kNoKey, cmd_documentation},
-    {fourcc("itli"), "Instrument List", Menu::Windows, nullptr, kNoKey, nullptr},
-    {fourcc("arra"), "Arrangement", Menu::Windows, nullptr, kNoKey, nullptr},
+    {fourcc("itli"), "Instrument List", Menu::Windows, nullptr, kNoKey, cmd_open_window},
+    {fourcc("arra"), "Arrangement", Menu::Windows, nullptr, kNoKey, cmd_open_window},
     {fourcc("wfft"), "FFT Window", Menu::Windows, nullptr, kNoKey, nullptr},
     // Songs in memory
     {fourcc("MulL"), "Multiple Music Loading", Menu::Music, nullptr, kNoKey, cmd_multiple_loading, nullptr,
@@ -115,6 +133,8 @@ const CommandInfo kCommands[] = {
      [](const Program& p) { return p.editor.layout == KeyboardLayout::Atari; }},
     {fourcc("AMIG"), "Amiga", Menu::Options, nullptr, kNoKey, cmd_keyboard_layout, nullptr,
      [](const Program& p) { return p.editor.layout == KeyboardLayout::Amiga; }},
+    // MIDI
+    {fourcc("SMch"), "Set Midi chanel", Menu::Midi, nullptr, kNoKey, cmd_open_window},
     // The transport buttons and keys
     {fourcc("PLsg"), "Play Song", Menu::None, nullptr, plain(kKeyF1 + 4), cmd_play_song},
     {fourcc("PLpt"), "Play Pattern", Menu::None, nullptr, plain(kKeyF1 + 5), cmd_play_pattern},
@@ -123,6 +143,25 @@ const CommandInfo kCommands[] = {
      [](const Program& p) { return p.engine.player.tr.floop != 0; }},
     {fourcc("MUTE"), "Mute track", Menu::None, nullptr, kNoKey, cmd_mute_track},
     {fourcc("CUto"), "Move the cursor", Menu::None, nullptr, kNoKey, cmd_cursor_to},
+    {fourcc("BLck"), "Mark a block", Menu::None, nullptr, kNoKey, cmd_mark_block},
+    // The panes' and windows' settings
+    {fourcc("SGnm"), "Song name", Menu::None, nullptr, kNoKey, cmd_song_setting},
+    {fourcc("SGtp"), "Tempo (BPM)", Menu::None, nullptr, kNoKey, cmd_song_setting},
+    {fourcc("SGsp"), "Speed", Menu::None, nullptr, kNoKey, cmd_song_setting},
+    {fourcc("SGvl"), "Master volume", Menu::None, nullptr, kNoKey, cmd_song_setting},
+    {fourcc("SGrw"), "Pattern rows", Menu::None, nullptr, kNoKey, cmd_song_setting},
+    {fourcc("SGtr"), "Tracks", Menu::None, nullptr, kNoKey, cmd_song_setting},
+    {fourcc("TKvc"), "Track voices", Menu::None, nullptr, kNoKey, cmd_track_setting},
+    {fourcc("TKpn"), "Track pan", Menu::None, nullptr, kNoKey, cmd_track_setting},
+    {fourcc("TKvl"), "Track volume", Menu::None, nullptr, kNoKey, cmd_track_setting},
+    {fourcc("TKmc"), "Track MIDI channel", Menu::None, nullptr, kNoKey, cmd_track_setting},
+    {fourcc("ILsl"), "Choose instrument", Menu::None, nullptr, kNoKey, cmd_instrument},
+    {fourcc("ILnm"), "Rename instrument", Menu::None, nullptr, kNoKey, cmd_instrument},
+    {fourcc("ARsl"), "Choose position", Menu::None, nullptr, kNoKey, cmd_arrangement},
+    {fourcc("ARdu"), "Duplicate position", Menu::None, nullptr, kNoKey, cmd_arrangement},
+    {fourcc("ARmv"), "Move position", Menu::None, nullptr, kNoKey, cmd_arrangement},
+    {fourcc("ARpt"), "Position pattern", Menu::None, nullptr, kNoKey, cmd_arrangement},
+    {fourcc("ARrp"), "Repeat position", Menu::None, nullptr, kNoKey, cmd_arrangement},
     // Between windows and threads
     {fourcc("refs"), "Open files", Menu::None, nullptr, kNoKey, cmd_open_files},
     {fourcc("SAvt"), "Save song to file", Menu::None, nullptr, kNoKey, cmd_save_song_to},

@@ -1,6 +1,9 @@
 #pragma once
 #include <cstdint>
 #include <string>
+#include <vector>
+
+#include "edit/cell_block.h"
 
 namespace ondrel {
 
@@ -28,6 +31,22 @@ struct BlockMarks {
     int16_t first_track = 0, first_row = 0, last_track = 0, last_row = 0;
 };
 
+// Notes of a chord being typed ("Accord Edit"): the row it goes to, its first track, and
+// the note keys still held.
+struct ChordEntry {
+    int row = 0;
+    int first_track = 0;
+    int notes = 0;
+    int keys_down = 0;
+};
+
+// What a search looks for and what a replacement writes, kept between searches.
+struct SearchState {
+    CellMask find;
+    CellMask replace;
+    EditRange::Kind scope = EditRange::Kind::Pattern;
+};
+
 // Where the editor stands beyond what the sequencer reads (the cursor row, column and
 // track, the current sound and the jump step live in the player's EditCursor).
 struct EditorState {
@@ -37,7 +56,15 @@ struct EditorState {
     int16_t view_top = 0;  // first row shown ("on_y")
     int16_t oftrack = 0;   // first track shown
     BlockMarks block;
-    bool follow_song = true;  // the pattern view follows the play position
+    int16_t block_anchor_track = 0, block_anchor_row = 0;  // where Shift+arrows started
+    bool follow_song = true;                               // the pattern view follows the play position
+    ChordEntry chord;
+    // One clipboard for each kind of copy: pattern, track and block.
+    CellClip pattern_clip, track_clip, block_clip;
+    SearchState search;
+    bool transpose_current_instrument_only = false;
+    EditRange::Kind transpose_scope = EditRange::Kind::Pattern;
+    std::vector<int> unused_instruments;  // marked by "Find instruments not used in the music"
 };
 
 }  // namespace ondrel

@@ -49,6 +49,9 @@ constexpr KeyChord ctrl_shift(int32_t key) {
 constexpr KeyChord plain(int32_t key) {
     return {key, kModNone};
 }
+constexpr KeyChord alt(int32_t key) {
+    return {key, kModAlt};
+}
 
 // "Ctrl+Shift+S", "F5": how menus show a shortcut.
 std::string chord_text(const KeyChord& chord);

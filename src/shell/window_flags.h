@@ -9,6 +9,9 @@ struct WindowFlags {
     bool instrument_list = false;
     bool arrangement = false;
     bool analyser = false;  // "FFT Window"
+    bool search = false;    // find and replace
+    bool transpose = false;
+    bool midi_channel = false;  // "Set Midi chanel" for the cursor's track
     bool full_screen = false;
     bool arrangement_follow = false;  // play started or stopped, or the cursor jumped
 };

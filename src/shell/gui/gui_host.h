@@ -24,12 +24,13 @@ public:
     bool open(std::string& why);
     // Runs frames until program's quit is done; interrupted tells a signal asked to end.
     void run(Program& program, MainWindow& window, const std::atomic<bool>& interrupted);
+    // One frame: takes in the queued commands, draws and presents.
+    void frame(Program& program, MainWindow& window);
     // Writes what the window shows now as a BMP file.
     bool screenshot(const std::string& path) const;
     const char* renderer_name() const;
 
 private:
-    void frame(Program& program, MainWindow& window);
     void handle_event(Program& program, const SDL_Event& event);
     void apply_full_screen(bool on);
 

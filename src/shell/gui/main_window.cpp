@@ -6,7 +6,11 @@
 #include <mutex>
 
 #include "shell/gui/alert_popups.h"
+#include "shell/gui/arrangement_window.h"
+#include "shell/gui/edit_windows.h"
+#include "shell/gui/instrument_list_window.h"
 #include "shell/gui/menu_bar.h"
+#include "shell/gui/song_pane.h"
 #include "shell/gui/status_line.h"
 #include "shell/gui/text_windows.h"
 #include "shell/gui/transport_bar.h"
@@ -39,21 +43,43 @@ void MainWindow::draw() {
     const float panes_top = menu_height + transport_height;
     draw_panes(panes_top, view->Size.y - panes_top - status_height);
     draw_status_line(p_, view->Size.y - status_height, status_height);
+    draw_arrangement_window(p_, *song_);
+    draw_instrument_list_window(p_);
+    draw_search_window(p_);
+    draw_transpose_window(p_);
+    draw_midi_channel_window(p_, *song_);
     draw_text_windows(p_);
     file_panel_.draw(p_);
     draw_alerts(p_);
 }
 
+namespace {
+constexpr ImGuiWindowFlags kPane = ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove |
+                                   ImGuiWindowFlags_NoSavedSettings | ImGuiWindowFlags_NoBringToFrontOnFocus;
+constexpr float kSideWidth = 300;
+
+bool begin_pane(const char* id, ImVec2 at, ImVec2 size, ImGuiWindowFlags extra = 0) {
+    ImGui::SetNextWindowPos(at);
+    ImGui::SetNextWindowSize(size);
+    return ImGui::Begin(id, nullptr, kPane | extra);
+}
+}  // namespace
+
 void MainWindow::draw_panes(float top, float height) {
     const ImGuiViewport* view = ImGui::GetMainViewport();
-    ImGui::SetNextWindowPos(ImVec2(0, top));
-    ImGui::SetNextWindowSize(ImVec2(view->Size.x, height));
-    constexpr ImGuiWindowFlags kPane = ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove |
-                                       ImGuiWindowFlags_NoSavedSettings |
-                                       ImGuiWindowFlags_NoBringToFrontOnFocus;
+    if (begin_pane("##side", ImVec2(0, top), ImVec2(kSideWidth, height)) &&
+        ImGui::BeginTabBar("##side tabs")) {
+        if (ImGui::BeginTabItem("Song")) {
+            draw_song_pane(p_, *song_);
+            ImGui::EndTabItem();
+        }
+        ImGui::EndTabBar();
+    }
+    ImGui::End();
     ImGui::PushStyleVar(ImGuiStyleVar_WindowPadding, ImVec2(4, 4));
-    ImGui::Begin("##panes", nullptr, kPane);
-    pattern_view_.draw(p_, *song_, ImGui::GetContentRegionAvail());
+    if (begin_pane("##pattern", ImVec2(kSideWidth, top), ImVec2(view->Size.x - kSideWidth, height),
+                   ImGuiWindowFlags_NoScrollWithMouse))
+        pattern_view_.draw(p_, *song_, ImGui::GetContentRegionAvail());
     ImGui::End();
     ImGui::PopStyleVar();
 }

@@ -5,6 +5,7 @@
 
 #include "shell/cell_text.h"
 #include "shell/editor_cursor.h"
+#include "shell/gui/song_pane.h"
 #include "shell/program.h"
 
 namespace ondrel {
@@ -53,7 +54,7 @@ void PatternView::place_view(Program& p, int rows, int tracks) {
     p.editor.oftrack = static_cast<int16_t>(of);
 }
 
-void PatternView::draw_headers(Program& p, ImDrawList* dl, ImVec2 origin, int tracks) {
+void PatternView::draw_headers(Program& p, const TMOD& song, ImDrawList* dl, ImVec2 origin, int tracks) {
     const Transport& tr = p.engine.player.tr;
     for (int i = 0; i < visible_tracks_; ++i) {
         const int t = p.editor.oftrack + i;
@@ -74,7 +75,12 @@ void PatternView::draw_headers(Program& p, ImDrawList* dl, ImVec2 origin, int tr
         ImGui::PushID(t);
         if (ImGui::InvisibleButton("##header", ImVec2(track_w_ - 4, header_h_ - 4)))
             p.post(ShellMessage(fourcc("MUTE")).with("track", t));
-        if (ImGui::IsItemHovered()) ImGui::SetTooltip("Click to mute or unmute track %d", t + 1);
+        if (ImGui::IsItemHovered())
+            ImGui::SetTooltip("Click: mute or unmute track %d. Right click: its settings", t + 1);
+        if (ImGui::BeginPopupContextItem("##track")) {
+            draw_track_settings(p, song, t);
+            ImGui::EndPopup();
+        }
         ImGui::PopID();
     }
 }
@@ -88,14 +94,41 @@ void PatternView::handle_mouse(Program& p, ImVec2 origin, int rows) {
         const int row = std::clamp(int(p.engine.player.cursor.poscurv) - int(io.MouseWheel * 4), 0, rows - 1);
         p.post(ShellMessage(fourcc("CUto")).with("row", row));
     }
-    if (!inside || !ImGui::IsMouseClicked(ImGuiMouseButton_Left)) return;
-    const int row = view_top_ + int((m.y - top) / row_h_);
-    const int column = int((m.x - origin.x - number_w_) / track_w_);
-    const int track = p.editor.oftrack + column;
-    const int x = int((m.x - origin.x - number_w_ - column * track_w_ - 4) / char_w_);
-    if (row < 0 || row >= rows) return;
-    p.post(
-        ShellMessage(fourcc("CUto")).with("row", row).with("track", track).with("field", field_at_column(x)));
+    const auto cell_under_mouse = [&](int& row, int& track, int& field) {
+        row = std::clamp(view_top_ + int((m.y - top) / row_h_), 0, rows - 1);
+        const int column = std::max(0, int((m.x - origin.x - number_w_) / track_w_));
+        track = std::min(p.editor.oftrack + column, current_tracks(p) - 1);
+        field = field_at_column(int((m.x - origin.x - number_w_ - column * track_w_ - 4) / char_w_));
+    };
+    int row = 0, track = 0, field = 0;
+    if (inside && ImGui::IsMouseClicked(ImGuiMouseButton_Left)) {
+        cell_under_mouse(row, track, field);
+        drag_row_ = row;
+        drag_track_ = track;
+        dragging_ = true;
+        p.post(ShellMessage(fourcc("CUto")).with("row", row).with("track", track).with("field", field));
+        if (p.editor.block.active) p.post(fourcc("BLck"));  // a click drops the block
+        return;
+    }
+    if (!dragging_) return;
+    if (!ImGui::IsMouseDown(ImGuiMouseButton_Left)) {
+        dragging_ = false;
+        return;
+    }
+    if (!ImGui::IsMouseDragging(ImGuiMouseButton_Left)) return;
+    // A drag marks the rectangle from where it began to the cell under the mouse.
+    cell_under_mouse(row, track, field);
+    const BlockMarks& b = p.editor.block;
+    const int first_track = std::min(drag_track_, track), last_track = std::max(drag_track_, track);
+    const int first_row = std::min(drag_row_, row), last_row = std::max(drag_row_, row);
+    if (b.active && b.first_track == first_track && b.last_track == last_track && b.first_row == first_row &&
+        b.last_row == last_row)
+        return;
+    p.post(ShellMessage(fourcc("BLck"))
+               .with("first_track", first_track)
+               .with("last_track", last_track)
+               .with("first_row", first_row)
+               .with("last_row", last_row));
 }
 
 void PatternView::draw(Program& p, const TMOD& song, ImVec2 size) {
@@ -114,7 +147,7 @@ void PatternView::draw(Program& p, const TMOD& song, ImVec2 size) {
     ImDrawList* dl = ImGui::GetWindowDrawList();
     const ImVec2 origin = ImGui::GetCursorScreenPos();
     dl->AddRectFilled(origin, ImVec2(origin.x + size.x, origin.y + size.y), kBackground);
-    draw_headers(p, dl, origin, tracks);
+    draw_headers(p, song, dl, origin, tracks);
 
     const Transport& tr = p.engine.player.tr;
     const bool play_here = tr.playing && !tr.fplaytrack && tr.nopat == position;

@@ -15,13 +15,14 @@ public:
 
 private:
     void place_view(Program& p, int rows, int tracks);
-    void draw_headers(Program& p, ImDrawList* dl, ImVec2 origin, int tracks);
+    void draw_headers(Program& p, const TMOD& song, ImDrawList* dl, ImVec2 origin, int tracks);
     void handle_mouse(Program& p, ImVec2 origin, int rows);
 
     float char_w_ = 7, row_h_ = 15, header_h_ = 30, number_w_ = 35, track_w_ = 120;
     int visible_rows_ = 1, visible_tracks_ = 1;
     int view_top_ = 0;
     bool dragging_ = false;
+    int drag_row_ = 0, drag_track_ = 0;  // where a drag with the mouse began
 };
 
 }  // namespace ondrel
