@@ -21,6 +21,7 @@ public:
           units(bank, slots),
           rack(bank, slots, units, player) {
         mixer.set_effects(&units);
+        mixer.set_preview(&preview);
         player.units = &units;
         // Echo lines for every unit at the song's lengths, so routing never waits on memory.
         for (int u = 0; u < kEchoUnits; ++u)
@@ -36,6 +37,7 @@ public:
     Mixer mixer;
     EffectUnits units;
     EffectRack rack;
+    SoundPreview preview;  // a sound heard outside the song (browser, sample editor)
 };
 
 }  // namespace ondrel

@@ -96,6 +96,7 @@ void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
     // A buffer of zeros needs no clipping and has no peak: a stopped or silent stretch
     // of a song costs little more than clearing its buffer.
     silent = !effect_stage(out, frames, m) && silent;
+    if (preview_ && preview_->mix(out, frames, frame_rate)) silent = false;
     output_stage(out, frames, format, silent);
 
     if (!measure) return;

@@ -7,6 +7,7 @@
 #include "render/audio_format.h"
 #include "render/effect_processor.h"
 #include "render/output_taps.h"
+#include "render/sound_preview.h"
 #include "render/voice_mix.h"
 #include "song/effect_slots.h"
 #include "song/song_bank.h"
@@ -45,6 +46,7 @@ public:
     void set_effects(EffectProcessor* units) { units_ = units; }
     void set_recorder(OutputRecorder* recorder) { recorder_ = recorder; }
     void set_monitor(MonitorRing* ring) { monitor_ring_ = ring; }
+    void set_preview(SoundPreview* preview) { preview_ = preview; }
 
     // The callback: fills size bytes of interleaved stereo float at buffer.
     void BufferProc(void* cookie, void* buffer, unsigned long size, const AudioFormat& format);
@@ -83,6 +85,7 @@ private:
     EffectProcessor* units_ = nullptr;
     OutputRecorder* recorder_ = nullptr;
     MonitorRing* monitor_ring_ = nullptr;
+    SoundPreview* preview_ = nullptr;
 
     // Per piece: the control value of each slot, its compact number, and whether a voice
     // has written its send buffer yet.

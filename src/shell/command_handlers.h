@@ -32,6 +32,13 @@ void offer_recovery_copies(Program& p);
 void restore_editor_position(Program& p);
 void store_editor_position(Program& p);
 
+// The file browser's menus: its views, the audio search, refresh; the paths menu.
+void cmd_browser_menu(Program& p, const ShellMessage& m);
+void cmd_paths_item(Program& p, const ShellMessage& m);
+void cmd_browser_go(Program& p, const ShellMessage& m);
+// Plays a sound file on its own (none: stops what plays).
+void cmd_preview_sound(Program& p, const ShellMessage& m);
+
 // Songs in memory.
 void cmd_multiple_loading(Program& p, const ShellMessage& m);
 void cmd_kill_song(Program& p, const ShellMessage& m);

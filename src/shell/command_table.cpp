@@ -17,6 +17,13 @@ bool can_undo(const Program& p) {
 bool can_redo(const Program& p) {
     return p.history().can_redo();
 }
+bool has_browser(const Program& p) {
+    return p.browser != nullptr;
+}
+template <uint32_t Code>
+bool browser_shows(const Program& p) {
+    return p.browser && p.browser->checked(Code);
+}
 bool has_block(const Program& p) {
     return p.editor.block.active;
 }
@@ -174,16 +181,25 @@ const CommandInfo kCommands[] = {
     {fourcc("reco"), "Record", Menu::None, nullptr, kNoKey, nullptr},
     {fourcc("stre"), "Stop recording", Menu::None, nullptr, kNoKey, nullptr},
     // The file browser
-    {fourcc("GO00"), "Add Path To music", Menu::BrowserPaths, nullptr, kNoKey, nullptr},
-    {fourcc("GO01"), "Add Path To sound", Menu::BrowserPaths, nullptr, kNoKey, nullptr},
-    {fourcc("GO02"), "Remove path", Menu::BrowserPaths, nullptr, kNoKey, nullptr},
-    {fourcc("seea"), "See All Files", Menu::Browser, nullptr, kNoKey, nullptr},
-    {fourcc("seed"), "See All Directory", Menu::Browser, nullptr, kNoKey, nullptr},
-    {fourcc("see1"), "See Directory with audio sound level 1", Menu::Browser, nullptr, kNoKey, nullptr},
-    {fourcc("seeA"), "See Directory with audio sound all levels", Menu::Browser, nullptr, kNoKey, nullptr},
-    {fourcc("find"), "Find all audio files", Menu::Browser, nullptr, kNoKey, nullptr},
-    {fourcc("NDMN"), "Refresh", Menu::Browser, nullptr, kNoKey, nullptr},
+    // Directory items carry 'GO00' + the number added before them, and the index of the
+    // item in the menu, which tells them apart from the fixed items.
+    {fourcc("GO00"), "Add Path To music", Menu::BrowserPaths, nullptr, kNoKey, cmd_paths_item, nullptr, nullptr,
+     kMaxPathsMenuItems},
+    {fourcc("GO01"), "Add Path To sound", Menu::BrowserPaths, nullptr, kNoKey, cmd_paths_item},
+    {fourcc("GO02"), "Remove path", Menu::BrowserPaths, nullptr, kNoKey, cmd_paths_item},
+    {fourcc("seea"), "See All Files", Menu::Browser, nullptr, kNoKey, cmd_browser_menu, has_browser,
+     browser_shows<fourcc("seea")>},
+    {fourcc("seed"), "See All Directory", Menu::Browser, nullptr, kNoKey, cmd_browser_menu, has_browser,
+     browser_shows<fourcc("seed")>},
+    {fourcc("see1"), "See Directory with audio sound level 1", Menu::Browser, nullptr, kNoKey, cmd_browser_menu,
+     has_browser, browser_shows<fourcc("see1")>},
+    {fourcc("seeA"), "See Directory with audio sound all levels", Menu::Browser, nullptr, kNoKey, cmd_browser_menu,
+     has_browser, browser_shows<fourcc("seeA")>},
+    {fourcc("find"), "Find all audio files", Menu::Browser, nullptr, kNoKey, cmd_browser_menu, has_browser},
+    {fourcc("NDMN"), "Refresh", Menu::Browser, nullptr, kNoKey, cmd_browser_menu, has_browser},
     {fourcc("abou"), "About...", Menu::Browser, nullptr, kNoKey, cmd_about},
+    {fourcc("BRgo"), "Go to a directory", Menu::None, nullptr, kNoKey, cmd_browser_go, has_browser},
+    {fourcc("PRVw"), "Preview a sound", Menu::None, nullptr, kNoKey, cmd_preview_sound},
     // The instrument editor's envelope selector
     {fourcc("co00"), "Velocity", Menu::Envelope, nullptr, kNoKey, nullptr},
     {fourcc("co01"), "Efx Env", Menu::Envelope, nullptr, kNoKey, nullptr},
@@ -205,6 +221,10 @@ std::span<const CommandInfo> command_table() {
 }
 
 const CommandInfo* find_command(uint32_t code) {
+    // A code of its own wins over a family that also covers it ('GO01' is both "Add Path
+    // To sound" and, as 'GO00' + 1, the second favourite directory).
+    for (const CommandInfo& c : kCommands)
+        if (code == c.code) return &c;
     for (const CommandInfo& c : kCommands)
         if (code >= c.code && code - c.code < c.family) return &c;
     return nullptr;

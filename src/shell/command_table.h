@@ -51,5 +51,6 @@ const CommandInfo* command_for_shortcut(const KeyChord& chord);
 const char* menu_title(Menu menu);
 
 inline constexpr uint32_t kMaxSongMenuItems = 63;
+inline constexpr uint32_t kMaxPathsMenuItems = 1024;  // 'GO00' + directories ever added
 
 }  // namespace ondrel

@@ -6,10 +6,11 @@
 #include "shell/command_handlers.h"
 #include "shell/command_table.h"
 #include "shell/editor_keys.h"
+#include "shell/user_directories.h"
 
 namespace ondrel {
 
-Program::Program() : engine(&alerts) {
+Program::Program() : engine(&alerts), paths(home_directory()) {
     histories_.resize(static_cast<size_t>(engine.bank.nbimod));
 }
 

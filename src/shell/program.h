@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <deque>
 #include <functional>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -11,8 +12,10 @@
 #include "engine/engine.h"
 #include "shell/alert_queue.h"
 #include "shell/editor_state.h"
+#include "shell/file_browser.h"
 #include "shell/file_panel_request.h"
 #include "shell/keys.h"
+#include "shell/path_settings.h"
 #include "shell/shell_message.h"
 #include "shell/window_flags.h"
 
@@ -61,9 +64,12 @@ public:
     uint64_t said_at_us() const { return said_at_; }
     std::string audio_status;  // "no sound device" when there is none
 
+    // The path file's settings (the browser's directory, the favourite directories) and
+    // the file browser, which the desktop program starts (headless runs have none).
+    PathSettings paths;
+    std::unique_ptr<FileBrowser> browser;
     // The file browser's directory, where the file panels open.
-    std::string browser_directory() const { return browser_dir; }
-    std::string browser_dir;
+    std::string browser_directory() const { return browser ? browser->directory() : paths.browser_directory; }
 
     // Asks before the current song's changes are lost, then runs go (at once when there
     // is nothing to lose, or after "Save" or "Don't Save"; never after "Cancel").

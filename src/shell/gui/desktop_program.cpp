@@ -5,9 +5,11 @@
 #include <iostream>
 
 #include "platform/sdl_audio_output.h"
+#include "shell/command_handlers.h"
 #include "shell/gui/gui_host.h"
 #include "shell/gui/main_window.h"
 #include "shell/program.h"
+#include "shell/user_directories.h"
 
 namespace ondrel {
 
@@ -45,7 +47,16 @@ int run_desktop(const std::vector<std::string>& files) {
         program.audio_status = "no sound device";
         std::cerr << "ondrel: " << why << "\n";
     }
-    program.on_quit = [&program] { program.engine.player.stoppi(); };
+    read_info_path(program.paths, config_directory());
+    program.browser = std::make_unique<FileBrowser>(program.paths.browser_directory);
+    program.on_quit = [&program] {
+        program.engine.player.stoppi();
+        program.paths.browser_directory = program.browser_directory();
+        std::string failed;
+        if (!write_info_path(program.paths, config_directory(), failed))
+            std::cerr << "ondrel: " << failed << "\n";
+    };
+    offer_recovery_copies(program);
     if (!files.empty()) {
         ShellMessage open(fourcc("refs"));
         open.refs = files;

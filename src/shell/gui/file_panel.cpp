@@ -63,7 +63,6 @@ void FilePanel::choose(Program& p, const std::string& name) {
         return;
     }
     confirm_replace_.clear();
-    p.browser_dir = directory_;
     p.file_chosen(path.string());
 }
 

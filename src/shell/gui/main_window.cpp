@@ -69,6 +69,10 @@ void MainWindow::draw_panes(float top, float height) {
     const ImGuiViewport* view = ImGui::GetMainViewport();
     if (begin_pane("##side", ImVec2(0, top), ImVec2(kSideWidth, height)) &&
         ImGui::BeginTabBar("##side tabs")) {
+        if (ImGui::BeginTabItem("Browser")) {
+            browser_pane_.draw(p_);
+            ImGui::EndTabItem();
+        }
         if (ImGui::BeginTabItem("Song")) {
             draw_song_pane(p_, *song_);
             ImGui::EndTabItem();

@@ -1,6 +1,7 @@
 #pragma once
 #include <memory>
 
+#include "shell/gui/browser_pane.h"
 #include "shell/gui/file_panel.h"
 #include "shell/gui/pattern_view.h"
 #include "song/tmod.h"
@@ -29,6 +30,7 @@ private:
     std::unique_ptr<TMOD> song_;
     PatternView pattern_view_;
     FilePanel file_panel_;
+    BrowserPane browser_pane_;
 };
 
 }  // namespace ondrel

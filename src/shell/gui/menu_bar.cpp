@@ -43,7 +43,9 @@ void song_items(Program& p, const CommandInfo& c) {
     }
 }
 
-void menu_items(Program& p, Menu menu) {
+}  // namespace
+
+void draw_menu_items(Program& p, Menu menu) {
     const auto table = command_table();
     for (size_t i = 0; i < table.size(); ++i) {
         const CommandInfo& c = table[i];
@@ -69,8 +71,6 @@ void menu_items(Program& p, Menu menu) {
     }
 }
 
-}  // namespace
-
 float draw_menu_bar(Program& p) {
     float height = 0;
     if (ImGui::BeginMainMenuBar()) {
@@ -79,7 +79,7 @@ float draw_menu_bar(Program& p) {
             for (const CommandInfo& c : command_table()) any = any || c.menu == menu;
             if (!any) continue;
             if (ImGui::BeginMenu(menu_title(menu))) {
-                menu_items(p, menu);
+                draw_menu_items(p, menu);
                 ImGui::EndMenu();
             }
         }
