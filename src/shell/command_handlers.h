@@ -99,6 +99,21 @@ void cmd_track_setting(Program& p, const ShellMessage& m);
 void cmd_instrument(Program& p, const ShellMessage& m);
 void cmd_arrangement(Program& p, const ShellMessage& m);
 
+// The instrument, sample and envelope editors.
+void cmd_sound_field(Program& p, const ShellMessage& m);
+void cmd_sound_tool(Program& p, const ShellMessage& m);
+void cmd_sound_frames(Program& p, const ShellMessage& m);
+void cmd_sound_block(Program& p, const ShellMessage& m);
+void cmd_sound_selection(Program& p, const ShellMessage& m);
+void cmd_play_sound(Program& p, const ShellMessage& m);
+void cmd_envelope(Program& p, const ShellMessage& m);
+
+// The effect panel and the tracks' routing.
+void cmd_effect_slot(Program& p, const ShellMessage& m);
+void cmd_effect_setting(Program& p, const ShellMessage& m);
+void cmd_reverb_setting(Program& p, const ShellMessage& m);
+void cmd_track_routing(Program& p, const ShellMessage& m);
+
 // Searches.
 void cmd_find_next(Program& p, const ShellMessage& m);
 void cmd_replace_all(Program& p, const ShellMessage& m);

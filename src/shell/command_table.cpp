@@ -24,6 +24,10 @@ template <uint32_t Code>
 bool browser_shows(const Program& p) {
     return p.browser && p.browser->checked(Code);
 }
+template <int Kind>
+bool envelope_shown(const Program& p) {
+    return p.editor.envelope_kind == Kind;
+}
 bool has_block(const Program& p) {
     return p.editor.block.active;
 }
@@ -201,11 +205,48 @@ const CommandInfo kCommands[] = {
     {fourcc("BRgo"), "Go to a directory", Menu::None, nullptr, kNoKey, cmd_browser_go, has_browser},
     {fourcc("PRVw"), "Preview a sound", Menu::None, nullptr, kNoKey, cmd_preview_sound},
     // The instrument editor's envelope selector
-    {fourcc("co00"), "Velocity", Menu::Envelope, nullptr, kNoKey, nullptr},
-    {fourcc("co01"), "Efx Env", Menu::Envelope, nullptr, kNoKey, nullptr},
-    {fourcc("co02"), "Panoramic", Menu::Envelope, nullptr, kNoKey, nullptr},
-    {fourcc("co03"), "Coarse tune", Menu::Envelope, nullptr, kNoKey, nullptr},
-    {fourcc("co04"), "Velocity off", Menu::Envelope, nullptr, kNoKey, nullptr},
+    {fourcc("co00"), "Velocity", Menu::Envelope, nullptr, kNoKey, cmd_envelope, nullptr, envelope_shown<0>},
+    {fourcc("co01"), "Efx Env", Menu::Envelope, nullptr, kNoKey, cmd_envelope, nullptr, envelope_shown<1>},
+    {fourcc("co02"), "Panoramic", Menu::Envelope, nullptr, kNoKey, cmd_envelope, nullptr, envelope_shown<2>},
+    {fourcc("co03"), "Coarse tune", Menu::Envelope, nullptr, kNoKey, cmd_envelope, nullptr, envelope_shown<3>},
+    {fourcc("co04"), "Velocity off", Menu::Envelope, nullptr, kNoKey, cmd_envelope, nullptr, envelope_shown<4>},
+    {fourcc("ENpt"), "Envelope point", Menu::None, nullptr, kNoKey, cmd_envelope},
+    {fourcc("ENon"), "Envelope on or off", Menu::None, nullptr, kNoKey, cmd_envelope},
+    // The instrument and sample editors
+    {fourcc("SNnm"), "Sound name", Menu::None, nullptr, kNoKey, cmd_sound_field},
+    {fourcc("SNvl"), "Sound volume", Menu::None, nullptr, kNoKey, cmd_sound_field},
+    {fourcc("SNft"), "Finetune", Menu::None, nullptr, kNoKey, cmd_sound_field},
+    {fourcc("SNrn"), "Reference note", Menu::None, nullptr, kNoKey, cmd_sound_field},
+    {fourcc("SNrt"), "Rate", Menu::None, nullptr, kNoKey, cmd_sound_field},
+    {fourcc("SNlp"), "Loop", Menu::None, nullptr, kNoKey, cmd_sound_field},
+    {fourcc("SNtl"), "Sound tool", Menu::None, nullptr, kNoKey, cmd_sound_tool},
+    {fourcc("SNcp"), "Copy frames", Menu::None, nullptr, kNoKey, cmd_sound_frames},
+    {fourcc("SNct"), "Cut frames", Menu::None, nullptr, kNoKey, cmd_sound_frames},
+    {fourcc("SNpa"), "Paste frames", Menu::None, nullptr, kNoKey, cmd_sound_frames},
+    {fourcc("SNcr"), "Crop", Menu::None, nullptr, kNoKey, cmd_sound_frames},
+    {fourcc("SNsi"), "Silence", Menu::None, nullptr, kNoKey, cmd_sound_frames},
+    {fourcc("SNse"), "Select frames", Menu::None, nullptr, kNoKey, cmd_sound_selection},
+    {fourcc("SNbk"), "Set a block", Menu::None, nullptr, kNoKey, cmd_sound_block},
+    {fourcc("SNbm"), "Move a block", Menu::None, nullptr, kNoKey, cmd_sound_block},
+    {fourcc("SNbc"), "Clear a block", Menu::None, nullptr, kNoKey, cmd_sound_block},
+    {fourcc("SNpl"), "Play the sound", Menu::None, nullptr, kNoKey, cmd_play_sound},
+    // The effect panel and the tracks' effect buttons
+    {fourcc("FXsh"), "Show an effect", Menu::None, nullptr, kNoKey, cmd_effect_slot},
+    {fourcc("FXcl"), "Clone efx", Menu::None, nullptr, kNoKey, cmd_effect_slot},
+    {fourcc("FXrm"), "Remove efx", Menu::None, nullptr, kNoKey, cmd_effect_slot},
+    {fourcc("FXdl"), "Echo Delay (ms)", Menu::None, nullptr, kNoKey, cmd_effect_setting},
+    {fourcc("FXbp"), "Set To BPM", Menu::None, nullptr, kNoKey, cmd_effect_setting},
+    {fourcc("FXfb"), "Feedback", Menu::None, nullptr, kNoKey, cmd_effect_setting},
+    {fourcc("FXiv"), "Invert Phase", Menu::None, nullptr, kNoKey, cmd_effect_setting},
+    {fourcc("FXap"), "Auto Pan D", Menu::None, nullptr, kNoKey, cmd_effect_setting},
+    {fourcc("FXsp"), "Speed", Menu::None, nullptr, kNoKey, cmd_effect_setting},
+    {fourcc("FXfq"), "Freq (Hz)", Menu::None, nullptr, kNoKey, cmd_effect_setting},
+    {fourcc("FXq "), "Q", Menu::None, nullptr, kNoKey, cmd_effect_setting},
+    {fourcc("RVdl"), "Reverb delay", Menu::None, nullptr, kNoKey, cmd_reverb_setting},
+    {fourcc("RVgn"), "Reverb gain", Menu::None, nullptr, kNoKey, cmd_reverb_setting},
+    {fourcc("RVlp"), "Reverb Lpf", Menu::None, nullptr, kNoKey, cmd_reverb_setting},
+    {fourcc("TKf+"), "Next effect slot", Menu::None, nullptr, kNoKey, cmd_track_routing},
+    {fourcc("TKf-"), "Previous effect slot", Menu::None, nullptr, kNoKey, cmd_track_routing},
     // The analyser's menus
     {fourcc("FFTs"), "Song", Menu::Analyser, "Source", kNoKey, nullptr},
     {fourcc("FFTi"), "Input", Menu::Analyser, "Source", kNoKey, nullptr},

@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "edit/cell_block.h"
+#include "edit/sound_edits.h"
 
 namespace ondrel {
 
@@ -65,6 +66,14 @@ struct EditorState {
     bool transpose_current_instrument_only = false;
     EditRange::Kind transpose_scope = EditRange::Kind::Pattern;
     std::vector<int> unused_instruments;  // marked by "Find instruments not used in the music"
+
+    // The sample editor: its selection (frames; empty for none), its clipboard, the
+    // envelope the envelope editor shows ('co00' .. 'co04'), the effect slot the effect
+    // panel shows.
+    FrameRange sound_selection;
+    SoundClip sound_clip;
+    int envelope_kind = 0;
+    int shown_effect = 0;
 };
 
 }  // namespace ondrel

@@ -2,12 +2,15 @@
 
 #include <imgui.h>
 
+#include <algorithm>
 #include <cstring>
 #include <mutex>
 
 #include "shell/gui/alert_popups.h"
 #include "shell/gui/arrangement_window.h"
 #include "shell/gui/edit_windows.h"
+#include "shell/gui/effect_editor.h"
+#include "shell/gui/instrument_editor.h"
 #include "shell/gui/instrument_list_window.h"
 #include "shell/gui/menu_bar.h"
 #include "shell/gui/song_pane.h"
@@ -57,6 +60,7 @@ namespace {
 constexpr ImGuiWindowFlags kPane = ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove |
                                    ImGuiWindowFlags_NoSavedSettings | ImGuiWindowFlags_NoBringToFrontOnFocus;
 constexpr float kSideWidth = 300;
+constexpr float kEditorsHeight = 290;
 
 bool begin_pane(const char* id, ImVec2 at, ImVec2 size, ImGuiWindowFlags extra = 0) {
     ImGui::SetNextWindowPos(at);
@@ -80,12 +84,39 @@ void MainWindow::draw_panes(float top, float height) {
         ImGui::EndTabBar();
     }
     ImGui::End();
+    const float width = view->Size.x - kSideWidth;
+    const float editors = std::min(kEditorsHeight, height * 0.45f);
     ImGui::PushStyleVar(ImGuiStyleVar_WindowPadding, ImVec2(4, 4));
-    if (begin_pane("##pattern", ImVec2(kSideWidth, top), ImVec2(view->Size.x - kSideWidth, height),
+    if (begin_pane("##pattern", ImVec2(kSideWidth, top), ImVec2(width, height - editors),
                    ImGuiWindowFlags_NoScrollWithMouse))
         pattern_view_.draw(p_, *song_, ImGui::GetContentRegionAvail());
     ImGui::End();
     ImGui::PopStyleVar();
+    draw_editors(kSideWidth, top + height - editors, width, editors);
+}
+
+void MainWindow::draw_editors(float left, float top, float width, float height) {
+    if (begin_pane("##editors", ImVec2(left, top), ImVec2(width, height)) &&
+        ImGui::BeginTabBar("##editor tabs")) {
+        if (ImGui::BeginTabItem("Instrument")) {
+            draw_instrument_editor(p_);
+            ImGui::EndTabItem();
+        }
+        if (ImGui::BeginTabItem("Sample")) {
+            sample_editor_.draw(p_);
+            ImGui::EndTabItem();
+        }
+        if (ImGui::BeginTabItem("Envelope")) {
+            envelope_editor_.draw(p_);
+            ImGui::EndTabItem();
+        }
+        if (ImGui::BeginTabItem("Effects")) {
+            draw_effect_editor(p_, *song_);
+            ImGui::EndTabItem();
+        }
+        ImGui::EndTabBar();
+    }
+    ImGui::End();
 }
 
 }  // namespace ondrel

@@ -2,8 +2,10 @@
 #include <memory>
 
 #include "shell/gui/browser_pane.h"
+#include "shell/gui/envelope_editor.h"
 #include "shell/gui/file_panel.h"
 #include "shell/gui/pattern_view.h"
+#include "shell/gui/sample_editor.h"
 #include "song/tmod.h"
 
 namespace ondrel {
@@ -23,6 +25,7 @@ public:
 private:
     void take_song_snapshot();
     void draw_panes(float top, float height);
+    void draw_editors(float left, float top, float width, float height);
 
     Program& p_;
     // The current song's record as of this frame: the sequencer writes a few fields while
@@ -31,6 +34,8 @@ private:
     PatternView pattern_view_;
     FilePanel file_panel_;
     BrowserPane browser_pane_;
+    SampleEditor sample_editor_;
+    EnvelopeEditor envelope_editor_;
 };
 
 }  // namespace ondrel
