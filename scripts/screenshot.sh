@@ -28,5 +28,6 @@ kill -TERM "$pid"
 wait "$pid"
 INNER
 chmod +x "$home/shoot.sh"
-xvfb-run -a -s '-screen 0 1280x800x24' "$home/shoot.sh" "$PWD/$out" "$home"
+case "$out" in /*) ;; *) out=$PWD/$out ;; esac
+xvfb-run -a -s "-screen 0 1280x800x24" "$home/shoot.sh" "$out" "$home"
 echo "screenshot: $out"

@@ -16,6 +16,7 @@ namespace {
 constexpr ImU32 kBack = IM_COL32(16, 20, 28, 255);
 constexpr ImU32 kGrid = IM_COL32(45, 50, 65, 255);
 constexpr ImU32 kCurve = IM_COL32(255, 200, 90, 255);
+constexpr ImU32 kCurveOff = IM_COL32(120, 100, 60, 255);  // the mixer does not apply it
 constexpr ImU32 kPoint = IM_COL32(240, 240, 250, 255);
 constexpr ImU32 kPointHot = IM_COL32(255, 90, 90, 255);
 constexpr float kPointRadius = 5;
@@ -28,6 +29,7 @@ void EnvelopeEditor::draw(Program& p) {
     const int kind = p.editor.envelope_kind;
     ImGui::TextUnformatted("A.D.S.R.");
     ImGui::SameLine();
+    ImGui::SetNextItemWidth(180);
     if (ImGui::BeginCombo("##envelope", find_command(fourcc("co00") + uint32_t(kind))->label)) {
         draw_menu_items(p, Menu::Envelope);
         ImGui::EndCombo();
@@ -59,7 +61,7 @@ void EnvelopeEditor::draw(Program& p) {
         const auto y = [&](int i) {
             return at.y + size.y - size.y * std::clamp(curve[size_t(i)] / kTop[kind], 0.0f, 1.0f);
         };
-        dl->AddLine(ImVec2(at.x + x - 1, y(x - 1)), ImVec2(at.x + x, y(x)), kCurve, 2);
+        dl->AddLine(ImVec2(at.x + x - 1, y(x - 1)), ImVec2(at.x + x, y(x)), on ? kCurve : kCurveOff, 2);
     }
     const auto place = [&](int x, int level) {
         return ImVec2(at.x + size.x * float(x) / 255.0f, at.y + size.y - size.y * float(level) / 255.0f);

@@ -103,14 +103,14 @@ void SampleEditor::toolbar(Program& p, const p_s* s) {
     ImGui::BeginDisabled(p.editor.sound_clip.bytes.empty());
     if (ImGui::Button("Paste")) p.post(fourcc("SNpa"));
     ImGui::EndDisabled();
-    ImGui::SameLine(0, 16);
+
     if (ImGui::Button("Zoom +")) per_pixel_ = std::max(0.05, per_pixel_ / 2);
     ImGui::SameLine();
     if (ImGui::Button("Zoom -")) per_pixel_ *= 2;
     ImGui::SameLine();
     if (ImGui::Button("All")) per_pixel_ = 0;
-
     if (!sound) return;
+    ImGui::SameLine(0, 16);
     if (sel.whole())
         ImGui::TextDisabled("No selection: the tools act on the whole sound (drag to select)");
     else

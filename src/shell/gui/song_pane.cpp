@@ -53,7 +53,14 @@ void draw_track_settings(Program& p, const TMOD& song, int track) {
     if (slider_field("Pan", song.trackvol[track], value, 0, 127)) post("TKpn", value);
     if (slider_field("Volume", song.trackpan[track], value, 0, 255)) post("TKvl", value);
     if (number_field("MIDI channel (0: samples)", song.trackword1[track], value, 0, 16)) post("TKmc", value);
-    ImGui::Text("Effect slot %d", int(song.tracke[track]));
+    if (ImGui::ArrowButton("##fx down", ImGuiDir_Left))
+        p.post(ShellMessage(fourcc("TKf-")).with("track", track));
+    ImGui::SameLine();
+    if (ImGui::ArrowButton("##fx up", ImGuiDir_Right))
+        p.post(ShellMessage(fourcc("TKf+")).with("track", track));
+    ImGui::SameLine();
+    const int slot = song.tracke[track];
+    ImGui::Text("Effect: %s", slot ? p.engine.rack.label(slot).c_str() : "none (dry)");
 }
 
 void draw_song_pane(Program& p, const TMOD& song) {
