@@ -15,3 +15,5 @@ fi
 BUILD_TYPE=Release scripts/build.sh build-bench -DONDREL_TESTS=OFF -DONDREL_BENCH=ON
 build-bench/bench/bench_peers --runs "${RUNS:-5}"
 build-bench/bench/bench_effects --benchmark_min_time=0.5
+# The desktop window's cost per frame, in a virtual display.
+xvfb-run -a -s '-screen 0 1280x800x24' build-bench/bench/bench_gui_frame

@@ -56,7 +56,13 @@ bool GuiHost::open(std::string& why) {
     }
     if (!wants_software_renderer())
         renderer_ = SDL_CreateRenderer(window_, -1, SDL_RENDERER_ACCELERATED | SDL_RENDERER_PRESENTVSYNC);
-    if (!renderer_) renderer_ = SDL_CreateRenderer(window_, -1, SDL_RENDERER_SOFTWARE);
+    if (!renderer_) {
+        // Drawn in software, the frame goes to the screen as a plain image: passing it
+        // through a GL texture (SDL's default where GL exists, even a software GL) costs
+        // more than drawing it.
+        SDL_SetHint(SDL_HINT_FRAMEBUFFER_ACCELERATION, "0");
+        renderer_ = SDL_CreateRenderer(window_, -1, SDL_RENDERER_SOFTWARE);
+    }
     if (!renderer_) {
         why = std::string("cannot draw in the desktop window: ") + SDL_GetError();
         return false;
@@ -66,6 +72,13 @@ bool GuiHost::open(std::string& why) {
     ImGuiIO& io = ImGui::GetIO();
     io.IniFilename = nullptr;  // window places are the program's, not a file's in the cwd
     ImGui::StyleColorsDark();
+    // Square-edged shapes: without the feathered fringes every filled shape is a plain
+    // rectangle, which a software renderer fills far faster.
+    ImGuiStyle& style = ImGui::GetStyle();
+    style.AntiAliasedFill = false;
+    style.AntiAliasedLines = false;
+    // Opaque panes: nothing shows through them, so nothing needs blending.
+    for (ImGuiCol c : {ImGuiCol_WindowBg, ImGuiCol_PopupBg, ImGuiCol_MenuBarBg}) style.Colors[c].w = 1.0f;
     ImGui_ImplSDL2_InitForSDLRenderer(window_);
     ImGui_ImplSDLRenderer_Init(renderer_);
     imgui_ready_ = true;
@@ -120,7 +133,8 @@ void GuiHost::frame(Program& program, MainWindow& window) {
     ImGui::NewFrame();
     window.draw();
     ImGui::Render();
-    SDL_SetRenderDrawColor(renderer_, 18, 18, 22, 255);
+    const ImVec4 pane = ImGui::GetStyle().Colors[ImGuiCol_WindowBg];
+    SDL_SetRenderDrawColor(renderer_, Uint8(pane.x * 255), Uint8(pane.y * 255), Uint8(pane.z * 255), 255);
     SDL_RenderClear(renderer_);
     ImGui_ImplSDLRenderer_RenderDrawData(ImGui::GetDrawData());
     SDL_RenderPresent(renderer_);

@@ -13,6 +13,7 @@
 #include "shell/gui/instrument_editor.h"
 #include "shell/gui/instrument_list_window.h"
 #include "shell/gui/menu_bar.h"
+#include "shell/gui/pane.h"
 #include "shell/gui/song_pane.h"
 #include "shell/gui/status_line.h"
 #include "shell/gui/text_windows.h"
@@ -57,16 +58,8 @@ void MainWindow::draw() {
 }
 
 namespace {
-constexpr ImGuiWindowFlags kPane = ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove |
-                                   ImGuiWindowFlags_NoSavedSettings | ImGuiWindowFlags_NoBringToFrontOnFocus;
 constexpr float kSideWidth = 300;
 constexpr float kEditorsHeight = 290;
-
-bool begin_pane(const char* id, ImVec2 at, ImVec2 size, ImGuiWindowFlags extra = 0) {
-    ImGui::SetNextWindowPos(at);
-    ImGui::SetNextWindowSize(size);
-    return ImGui::Begin(id, nullptr, kPane | extra);
-}
 }  // namespace
 
 void MainWindow::draw_panes(float top, float height) {

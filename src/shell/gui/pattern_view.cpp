@@ -12,7 +12,6 @@ namespace ondrel {
 
 namespace {
 
-constexpr ImU32 kBackground = IM_COL32(20, 20, 26, 255);
 constexpr ImU32 kBeat = IM_COL32(32, 32, 42, 255);     // every 4 rows
 constexpr ImU32 kMeasure = IM_COL32(46, 46, 62, 255);  // every 16 rows
 constexpr ImU32 kPlayRow = IM_COL32(70, 60, 20, 255);
@@ -146,7 +145,6 @@ void PatternView::draw(Program& p, const TMOD& song, ImVec2 size) {
 
     ImDrawList* dl = ImGui::GetWindowDrawList();
     const ImVec2 origin = ImGui::GetCursorScreenPos();
-    dl->AddRectFilled(origin, ImVec2(origin.x + size.x, origin.y + size.y), kBackground);
     draw_headers(p, song, dl, origin, tracks);
 
     const Transport& tr = p.engine.player.tr;

@@ -2,6 +2,7 @@
 
 #include <imgui.h>
 
+#include "shell/gui/pane.h"
 #include "shell/program.h"
 
 namespace ondrel {
@@ -12,10 +13,7 @@ constexpr uint64_t kSayingLastsUs = 8'000'000;
 
 void draw_status_line(Program& p, float top, float height) {
     const ImGuiViewport* view = ImGui::GetMainViewport();
-    ImGui::SetNextWindowPos(ImVec2(0, top));
-    ImGui::SetNextWindowSize(ImVec2(view->Size.x, height));
-    ImGui::Begin("##status", nullptr,
-                 ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove | ImGuiWindowFlags_NoSavedSettings);
+    begin_pane("##status", ImVec2(0, top), ImVec2(view->Size.x, height));
     ImGui::TextUnformatted(p.engine.player.status);
     ImGui::SameLine(0, 20);
     if (p.editor.edit_mode)

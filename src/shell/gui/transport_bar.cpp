@@ -6,6 +6,7 @@
 #include <cstdio>
 
 #include "shell/command_table.h"
+#include "shell/gui/pane.h"
 #include "shell/program.h"
 
 namespace ondrel {
@@ -38,10 +39,7 @@ void meter(const char* label, float value) {
 float draw_transport_bar(Program& p, const TMOD& song, float top) {
     const ImGuiViewport* view = ImGui::GetMainViewport();
     const float height = ImGui::GetFrameHeightWithSpacing() * 2 + 8;
-    ImGui::SetNextWindowPos(ImVec2(0, top));
-    ImGui::SetNextWindowSize(ImVec2(view->Size.x, height));
-    ImGui::Begin("##transport", nullptr,
-                 ImGuiWindowFlags_NoDecoration | ImGuiWindowFlags_NoMove | ImGuiWindowFlags_NoSavedSettings);
+    begin_pane("##transport", ImVec2(0, top), ImVec2(view->Size.x, height));
     const Player& player = p.engine.player;
     const Transport& tr = player.tr;
     const bool playing = tr.playing != 0;
