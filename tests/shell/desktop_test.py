@@ -44,6 +44,11 @@ def region(path, x, y, w, h):
                           capture_output=True, timeout=30).stdout
 
 
+def sample_crc(path, index):
+    info = json.loads(run(ONDREL, "info", "--json", path).stdout)
+    return next((s["crc32"] for s in info["samples"] if s["index"] == index), None)
+
+
 def song_cells(path):
     info = json.loads(run(ONDREL, "info", "--json", path).stdout)
     pattern = info["sequence"][0]
@@ -72,6 +77,17 @@ try:
         def key(*keys):
             run("xdotool", "key", "--window", window, *keys)
             time.sleep(0.25)
+
+        def click(x, y):
+            # Without a window manager a pointer warp is no motion to SDL: a small move
+            # after it is, and the button then lands where the pointer is.
+            run("xdotool", "mousemove", "--window", window, str(x), str(y))
+            run("xdotool", "mousemove_relative", "1", "0")
+            time.sleep(0.3)
+            run("xdotool", "mousedown", "1")
+            time.sleep(0.15)
+            run("xdotool", "mouseup", "1")
+            time.sleep(0.4)
 
         first = screenshot(os.path.join(home, "start.png"))
         size = run("identify", "-format", "%w %h", first).stdout.split()
@@ -108,6 +124,15 @@ try:
                 check(name, len(os.getxattr(song, name)) == 4)
             except OSError as e:
                 check(name, False, str(e))
+
+        # The sample editor: "Reverse" on the first instrument's sound, then saved.
+        before = sample_crc(song, 1)
+        click(415, 502)  # the "Sample" tab
+        screenshot(os.path.join(home, "sample.png"))
+        click(762, 525)  # "Reverse"
+        key("ctrl+s")
+        wait_for(lambda: sample_crc(song, 1) != before, 5)
+        check("Reverse reached the saved sound", sample_crc(song, 1) not in (None, before), before)
 
         # One more note, then a signal: the change is kept as a recovery copy.
         key("v")
