@@ -3,6 +3,7 @@
 
 #include "edit/pattern_edits.h"
 #include "shell/command_handlers.h"
+#include "shell/command_table.h"
 #include "shell/editor_cursor.h"
 #include "shell/program.h"
 
@@ -66,10 +67,7 @@ void clear(Program& p, Scope scope, const char* label) {
 void cmd_clear_cells(Program& p, const ShellMessage& m) {
     const Scope scope = scope_of(m.code);
     if (needs_block(p, scope)) return;
-    clear(p, scope,
-          scope == Scope::Pattern ? "Pattern Clear"
-          : scope == Scope::Track ? "Track Clear"
-                                  : "Block Clear");
+    clear(p, scope, find_command(m.code)->label);
 }
 
 void cmd_copy_cells(Program& p, const ShellMessage& m) {
@@ -84,10 +82,7 @@ void cmd_cut_cells(Program& p, const ShellMessage& m) {
     const Scope scope = scope_of(m.code);
     if (needs_block(p, scope)) return;
     copy_to_clipboard(p, scope);
-    clear(p, scope,
-          scope == Scope::Pattern ? "Pattern Cut"
-          : scope == Scope::Track ? "Track Cut"
-                                  : "Block Cut");
+    clear(p, scope, find_command(m.code)->label);
 }
 
 void cmd_paste_cells(Program& p, const ShellMessage& m) {
