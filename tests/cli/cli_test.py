@@ -59,6 +59,8 @@ for s in demo["samples"]:
 # Text report.
 r = run("info", DEMO)
 check("info exit", r.returncode == 0, r.stderr)
+
+
 for needle in ("Ondrel Morning", "Patterns:", "Samples:", "kick", "125.00 BPM"):
     check(f"text has {needle}", needle in r.stdout, r.stdout[:400])
 
@@ -254,7 +256,11 @@ with tempfile.TemporaryDirectory() as tmp:
     check("edit-sound help", run("edit-sound", "--help").returncode == 0)
 
 # Usage errors exit 2; help exits 0.
-check("no command", run().returncode == 2)
+# Without a display the desktop program says so in one line and points at the commands.
+nodisplay = {k: v for k, v in os.environ.items() if k not in ("DISPLAY", "WAYLAND_DISPLAY")}
+r = subprocess.run([ONDREL], capture_output=True, text=True, timeout=60, env=nodisplay)
+check("no display: exit 2", r.returncode == 2, r.returncode)
+check("no display: one line naming play and render", r.stderr.count("\n") == 1 and "render" in r.stderr, r.stderr)
 check("unknown command", run("frobnicate").returncode == 2)
 check("info without file", run("info").returncode == 2)
 check("unknown option", run("info", "--bogus", DEMO).returncode == 2)

@@ -113,8 +113,12 @@ try:
         key("space")
         for k in ("z", "x", "c"):
             key(k)
+        title = run("xdotool", "getwindowname", window).stdout.strip()
+        check("the title shows unsaved changes", title == "Ondrel Tracker - Ondrel Morning *", title)
         key("ctrl+s")
         wait_for(lambda: song_cells(song).get((2, 0), [0])[0] == 64, 5)
+        title = run("xdotool", "getwindowname", window).stdout.strip()
+        check("and drops the mark once saved", title == "Ondrel Tracker - Ondrel Morning", title)
         cells = song_cells(song)
         check("typed notes saved", [cells.get((r, 0), [0])[0] for r in range(3)] == [60, 62, 64],
               [cells.get((r, 0)) for r in range(3)])

@@ -128,6 +128,10 @@ void GuiHost::apply_full_screen(bool on) {
 void GuiHost::frame(Program& program, MainWindow& window) {
     program.run_pending();
     apply_full_screen(program.windows.full_screen);
+    if (std::string title = window.title(); title != title_) {
+        title_ = std::move(title);
+        SDL_SetWindowTitle(window_, title_.c_str());
+    }
     ImGui_ImplSDLRenderer_NewFrame();
     ImGui_ImplSDL2_NewFrame();
     ImGui::NewFrame();

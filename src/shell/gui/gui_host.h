@@ -38,6 +38,7 @@ private:
     SDL_Renderer* renderer_ = nullptr;
     bool imgui_ready_ = false;
     bool full_screen_ = false;
+    std::string title_;
 };
 
 }  // namespace ondrel

@@ -32,6 +32,13 @@ bool MainWindow::animating() const {
     return false;
 }
 
+std::string MainWindow::title() const {
+    const TMOD& song = p_.engine.bank.current();
+    std::string text = std::string("Ondrel Tracker - ") + (song.name[0] ? song.name : "No name");
+    if (p_.history().dirty()) text += " *";
+    return text;
+}
+
 void MainWindow::take_song_snapshot() {
     SongBank& bank = p_.engine.bank;
     std::lock_guard<StructureLock> guard(bank.structure_lock());

@@ -1,5 +1,6 @@
 #pragma once
 #include <memory>
+#include <string>
 
 #include "shell/gui/browser_pane.h"
 #include "shell/gui/envelope_editor.h"
@@ -19,6 +20,8 @@ class MainWindow {
 public:
     explicit MainWindow(Program& program);
     void draw();
+    // "Ondrel Tracker - song name", with " *" while the song has unsaved changes.
+    std::string title() const;
     // Something on screen moves by itself (play, meters, a search): draw often.
     bool animating() const;
 
