@@ -2,33 +2,11 @@
 #include "record/capture_connection.h"
 
 #include "recorder_fixture.h"
-#include "wait_until.h"
+#include "support/fake_capture_input.h"
+#include "support/wait_until.h"
 
 namespace ondrel::test {
 namespace {
-
-class FakeInput final : public CaptureSource {
-public:
-    bool refuse = false;
-    CaptureSink* sink = nullptr;
-    int64_t clock = 1000000;
-    const std::string& name() const override { return name_; }
-    bool open(CaptureSink& s, std::string&) override {
-        sink = refuse ? nullptr : &s;
-        return !refuse;
-    }
-    void close() override { sink = nullptr; }
-    bool is_open() const override { return sink != nullptr; }
-    int64_t now_us() const override { return clock; }
-    // A buffer at the input's clock, which then moves on.
-    void play(const std::vector<int16_t>& frames) {
-        sink->deliver(frames.data(), frames.size() * 2, clock);
-        clock += static_cast<int64_t>(frames.size() / 2) * 1000000 / 44100;
-    }
-
-private:
-    std::string name_ = "Line In";
-};
 
 class CaptureConnectionTest : public RecorderFixture {
 protected:

@@ -10,7 +10,7 @@
 #include <vector>
 
 #include "scripted_port.h"
-#include "wait_until.h"
+#include "support/wait_until.h"
 
 namespace ondrel::test {
 namespace {

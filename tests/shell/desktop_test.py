@@ -5,11 +5,12 @@ Ctrl+S, end with SIGTERM. Behaviour is checked in the files; pixels only loosely
 import json
 import os
 import shutil
-import signal
 import subprocess
 import sys
 import tempfile
 import time
+
+from window_session import click, report, stop_by_signal
 
 ONDREL, DEMO = sys.argv[1], sys.argv[2]
 failures = []
@@ -78,17 +79,6 @@ try:
             run("xdotool", "key", "--window", window, *keys)
             time.sleep(0.25)
 
-        def click(x, y):
-            # Without a window manager a pointer warp is no motion to SDL: a small move
-            # after it is, and the button then lands where the pointer is.
-            run("xdotool", "mousemove", "--window", window, str(x), str(y))
-            run("xdotool", "mousemove_relative", "1", "0")
-            time.sleep(0.3)
-            run("xdotool", "mousedown", "1")
-            time.sleep(0.15)
-            run("xdotool", "mouseup", "1")
-            time.sleep(0.4)
-
         first = screenshot(os.path.join(home, "start.png"))
         size = run("identify", "-format", "%w %h", first).stdout.split()
         check("screenshot size", size == ["1280", "800"], size)
@@ -131,9 +121,9 @@ try:
 
         # The sample editor: "Reverse" on the first instrument's sound, then saved.
         before = sample_crc(song, 1)
-        click(415, 502)  # the "Sample" tab
+        click(window, (415, 502))  # the "Sample" tab
         screenshot(os.path.join(home, "sample.png"))
-        click(762, 525)  # "Reverse"
+        click(window, (762, 525))  # "Reverse"
         key("ctrl+s")
         wait_for(lambda: sample_crc(song, 1) != before, 5)
         check("Reverse reached the saved sound", sample_crc(song, 1) not in (None, before), before)
@@ -141,12 +131,7 @@ try:
         # One more note, then a signal: the change is kept as a recovery copy.
         key("v")
         time.sleep(0.3)
-    proc.send_signal(signal.SIGTERM)
-    try:
-        status = proc.wait(timeout=15)
-    except subprocess.TimeoutExpired:
-        proc.kill()
-        status = "hung"
+    status = stop_by_signal(proc)
     check("SIGTERM ends the program with status 0", status == 0, f"{status} {proc.stderr.read()[-400:]}")
     check("path file written", os.path.exists(os.path.join(home, "config", "ondrel", "ondrel.txt")))
     state = os.path.join(home, "state", "ondrel")
@@ -155,11 +140,4 @@ try:
 finally:
     if proc.poll() is None:
         proc.kill()
-    if not failures:
-        shutil.rmtree(home, ignore_errors=True)
-
-for f in failures:
-    print("FAIL", f)
-if failures:
-    print(f"(files kept in {home})")
-sys.exit(1 if failures else 0)
+sys.exit(report(home, failures))
