@@ -13,6 +13,10 @@ inline constexpr int kAnalyserWidth = 512;
 inline constexpr int kAnalyserHeight = 128;
 using AnalyserPixels = std::array<uint32_t, kAnalyserWidth * kAnalyserHeight>;
 
+// The analyser's source (the mixer's f_fftmode): the song's output or the recording input.
+inline constexpr int16_t kAnalyseSong = 1;
+inline constexpr int16_t kAnalyseInput = 2;
+
 inline constexpr int kViewClassic = 0;
 inline constexpr int kViewRadar = 1;
 // The analyser's refresh period; the radar moves one row a refresh.

@@ -114,6 +114,22 @@ void cmd_effect_setting(Program& p, const ShellMessage& m);
 void cmd_reverb_setting(Program& p, const ShellMessage& m);
 void cmd_track_routing(Program& p, const ShellMessage& m);
 
+// Recording: monitor, record, stop (also the recorder's own request to stop), the
+// panel's settings, its file; and when they can be chosen.
+void cmd_monitor(Program& p, const ShellMessage& m);
+void cmd_record(Program& p, const ShellMessage& m);
+void cmd_stop_recording(Program& p, const ShellMessage& m);
+void cmd_recording_setting(Program& p, const ShellMessage& m);
+void cmd_choose_recording_file(Program& p, const ShellMessage& m);
+void cmd_recording_file_chosen(Program& p, const ShellMessage& m);
+bool can_monitor(const Program& p);
+bool can_record(const Program& p);
+bool can_stop_recording(const Program& p);
+bool recording_idle(const Program& p);
+
+// The "FFT Window": opening it, its source and view menus.
+void cmd_analyser(Program& p, const ShellMessage& m);
+
 // Searches.
 void cmd_find_next(Program& p, const ShellMessage& m);
 void cmd_replace_all(Program& p, const ShellMessage& m);

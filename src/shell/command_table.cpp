@@ -112,7 +112,7 @@ const CommandInfo kCommands[] = {
     {fourcc("wmed"), "Documentation", Menu::Windows, nullptr, kNoKey, cmd_documentation},
     {fourcc("itli"), "Instrument List", Menu::Windows, nullptr, kNoKey, cmd_open_window},
     {fourcc("arra"), "Arrangement", Menu::Windows, nullptr, kNoKey, cmd_open_window},
-    {fourcc("wfft"), "FFT Window", Menu::Windows, nullptr, kNoKey, nullptr},
+    {fourcc("wfft"), "FFT Window", Menu::Windows, nullptr, kNoKey, cmd_analyser},
     // Songs in memory
     {fourcc("MulL"), "Multiple Music Loading", Menu::Music, nullptr, kNoKey, cmd_multiple_loading, nullptr,
      [](const Program& p) { return p.engine.bank.fmulload != 0; }},
@@ -181,9 +181,17 @@ const CommandInfo kCommands[] = {
     {fourcc("acti"), "Play started or stopped", Menu::None, nullptr, kNoKey, cmd_arrangement_follow},
     {fourcc("doup"), "Cursor jumped", Menu::None, nullptr, kNoKey, cmd_arrangement_follow},
     {fourcc("midi"), "MIDI note", Menu::None, nullptr, kNoKey, nullptr},
-    {fourcc("moni"), "Monitor", Menu::None, nullptr, kNoKey, nullptr},
-    {fourcc("reco"), "Record", Menu::None, nullptr, kNoKey, nullptr},
-    {fourcc("stre"), "Stop recording", Menu::None, nullptr, kNoKey, nullptr},
+    {fourcc("moni"), "Monitor", Menu::None, nullptr, kNoKey, cmd_monitor, can_monitor},
+    {fourcc("reco"), "Record", Menu::None, nullptr, kNoKey, cmd_record, can_record},
+    {fourcc("stre"), "Stop recording", Menu::None, nullptr, kNoKey, cmd_stop_recording, can_stop_recording},
+    // The recording panel
+    {fourcc("RCsr"), "Record the song's output", Menu::None, nullptr, kNoKey, cmd_recording_setting, recording_idle},
+    {fourcc("RCin"), "Input:", Menu::None, nullptr, kNoKey, cmd_recording_setting, recording_idle},
+    {fourcc("RCfm"), "Recording format", Menu::None, nullptr, kNoKey, cmd_recording_setting, recording_idle},
+    {fourcc("RCds"), "D2D File", Menu::None, nullptr, kNoKey, cmd_recording_setting, recording_idle},
+    {fourcc("RCgn"), "Recording gain", Menu::None, nullptr, kNoKey, cmd_recording_setting},
+    {fourcc("RCch"), "Choose the recording file", Menu::None, nullptr, kNoKey, cmd_choose_recording_file, recording_idle},
+    {fourcc("RCfl"), "Record to file", Menu::None, nullptr, kNoKey, cmd_recording_file_chosen},
     // The file browser
     // Directory items carry 'GO00' + the number added before them, and the index of the
     // item in the menu, which tells them apart from the fixed items.
@@ -248,10 +256,14 @@ const CommandInfo kCommands[] = {
     {fourcc("TKf+"), "Next effect slot", Menu::None, nullptr, kNoKey, cmd_track_routing},
     {fourcc("TKf-"), "Previous effect slot", Menu::None, nullptr, kNoKey, cmd_track_routing},
     // The analyser's menus
-    {fourcc("FFTs"), "Song", Menu::Analyser, "Source", kNoKey, nullptr},
-    {fourcc("FFTi"), "Input", Menu::Analyser, "Source", kNoKey, nullptr},
-    {fourcc("FTv0"), "Classic", Menu::Analyser, "View", kNoKey, nullptr},
-    {fourcc("FTv1"), "Radar", Menu::Analyser, "View", kNoKey, nullptr},
+    {fourcc("FFTs"), "Song", Menu::Analyser, "Source", kNoKey, cmd_analyser, nullptr,
+     [](const Program& p) { return p.engine.mixer.f_fftmode == kAnalyseSong; }},
+    {fourcc("FFTi"), "Input", Menu::Analyser, "Source", kNoKey, cmd_analyser, nullptr,
+     [](const Program& p) { return p.engine.mixer.f_fftmode == kAnalyseInput; }},
+    {fourcc("FTv0"), "Classic", Menu::Analyser, "View", kNoKey, cmd_analyser, nullptr,
+     [](const Program& p) { return p.analyser.view() == kViewClassic; }},
+    {fourcc("FTv1"), "Radar", Menu::Analyser, "View", kNoKey, cmd_analyser, nullptr,
+     [](const Program& p) { return p.analyser.view() == kViewRadar; }},
 };
 // clang-format on
 

@@ -10,7 +10,8 @@
 
 namespace ondrel {
 
-Program::Program() : engine(&alerts), paths(home_directory()) {
+Program::Program()
+    : engine(&alerts), recording(engine.mixer, &alerts, home_directory()), paths(home_directory()) {
     histories_.resize(static_cast<size_t>(engine.bank.nbimod));
 }
 
@@ -24,6 +25,10 @@ void Program::take_engine_messages() {
     auto posts = std::move(engine.player.window_posts);
     engine.player.window_posts.clear();
     for (const Message& p : posts) post(ShellMessage(p.code));
+    // The recorder asks to stop ('stre'): the memory is full, the input ended, a write failed.
+    bool stop = false;
+    while (recording.recorder.poll(m)) stop = stop || m.code == kMsgStre;
+    if (stop) post(ShellMessage(kMsgStre));
 }
 
 void Program::run_pending() {

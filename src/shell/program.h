@@ -11,11 +11,13 @@
 #include "edit/song_transaction.h"
 #include "engine/engine.h"
 #include "shell/alert_queue.h"
+#include "shell/analyser_view.h"
 #include "shell/editor_state.h"
 #include "shell/file_browser.h"
 #include "shell/file_panel_request.h"
 #include "shell/keys.h"
 #include "shell/path_settings.h"
+#include "shell/recording.h"
 #include "shell/shell_message.h"
 #include "shell/window_flags.h"
 
@@ -35,6 +37,8 @@ public:
     EditorState editor;
     WindowFlags windows;
     FilePanelRequest file_panel;  // the file panel to show, if any
+    Recording recording;          // the recorder, its input and the recording panel's choices
+    AnalyserView analyser;        // what the "FFT Window" shows
 
     // Commands. post() queues; run_pending() handles what the queues hold, in order,
     // after taking in what the audio thread and the other threads sent.

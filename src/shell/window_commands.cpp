@@ -24,7 +24,6 @@ void cmd_open_window(Program& p, const ShellMessage& m) {
     switch (m.code) {
         case fourcc("itli"): w.instrument_list = true; break;
         case fourcc("arra"): w.arrangement = true; break;
-        case fourcc("wfft"): w.analyser = true; break;
         case fourcc("Srch"): w.search = true; break;
         case fourcc("XPdl"): w.transpose = true; break;
         case fourcc("SMch"): w.midi_channel = true; break;

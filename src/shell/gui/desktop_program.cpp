@@ -5,10 +5,12 @@
 #include <iostream>
 
 #include "platform/sdl_audio_output.h"
+#include "platform/sdl_capture.h"
 #include "shell/command_handlers.h"
 #include "shell/gui/gui_host.h"
 #include "shell/gui/main_window.h"
 #include "shell/program.h"
+#include "shell/recording_settings.h"
 #include "shell/user_directories.h"
 
 namespace ondrel {
@@ -42,6 +44,10 @@ int run_desktop(const std::vector<std::string>& files) {
         return 2;
     }
     catch_quit_signals();
+    program.recording.set_inputs(capture_device_names(), [](const std::string& device) {
+        return std::make_unique<SdlCapture>(device);
+    });
+    read_recording_settings(program.recording, config_directory());
     SdlAudioOutput audio(program.engine.mixer, program.engine.player, program.engine.bank);
     if (!audio.open(kDeviceFrames, why)) {
         program.audio_status = "no sound device";
@@ -55,6 +61,8 @@ int run_desktop(const std::vector<std::string>& files) {
         std::string failed;
         if (!write_info_path(program.paths, config_directory(), failed))
             std::cerr << "ondrel: " << failed << "\n";
+        if (!write_recording_settings(program.recording, config_directory(), failed))
+            std::cerr << "ondrel: " << failed << "\n";
     };
     offer_recovery_copies(program);
     if (!files.empty()) {
@@ -62,7 +70,7 @@ int run_desktop(const std::vector<std::string>& files) {
         open.refs = files;
         program.post(std::move(open));
     }
-    MainWindow window(program);
+    MainWindow window(program, host.renderer());
     host.run(program, window, g_interrupted);
     audio.close();
     return 0;

@@ -29,6 +29,7 @@ public:
     // Writes what the window shows now as a BMP file.
     bool screenshot(const std::string& path) const;
     const char* renderer_name() const;
+    SDL_Renderer* renderer() const { return renderer_; }
 
 private:
     void handle_event(Program& program, const SDL_Event& event);

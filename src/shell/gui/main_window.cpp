@@ -14,6 +14,7 @@
 #include "shell/gui/instrument_list_window.h"
 #include "shell/gui/menu_bar.h"
 #include "shell/gui/pane.h"
+#include "shell/gui/record_panel.h"
 #include "shell/gui/song_pane.h"
 #include "shell/gui/status_line.h"
 #include "shell/gui/text_windows.h"
@@ -22,11 +23,12 @@
 
 namespace ondrel {
 
-MainWindow::MainWindow(Program& program) : p_(program), song_(std::make_unique<TMOD>()) {}
+MainWindow::MainWindow(Program& program, SDL_Renderer* renderer)
+    : p_(program), song_(std::make_unique<TMOD>()), analyser_window_(renderer) {}
 
 bool MainWindow::animating() const {
     const Transport& tr = p_.engine.player.tr;
-    if (tr.playing || tr.fplayonenote || tr.fplaytrack) return true;
+    if (tr.playing || tr.fplayonenote || tr.fplaytrack || p_.recording.busy()) return true;
     for (const auto& meter : tr.valvu)
         if (meter.load(std::memory_order_relaxed) > 0) return true;
     return false;
@@ -60,6 +62,7 @@ void MainWindow::draw() {
     draw_transpose_window(p_);
     draw_midi_channel_window(p_, *song_);
     draw_text_windows(p_);
+    analyser_window_.draw(p_);
     file_panel_.draw(p_);
     draw_alerts(p_);
 }
@@ -112,6 +115,10 @@ void MainWindow::draw_editors(float left, float top, float width, float height) 
         }
         if (ImGui::BeginTabItem("Effects")) {
             draw_effect_editor(p_, *song_);
+            ImGui::EndTabItem();
+        }
+        if (ImGui::BeginTabItem("Record")) {
+            draw_record_panel(p_);
             ImGui::EndTabItem();
         }
         ImGui::EndTabBar();

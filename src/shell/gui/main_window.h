@@ -2,6 +2,7 @@
 #include <memory>
 #include <string>
 
+#include "shell/gui/analyser_window.h"
 #include "shell/gui/browser_pane.h"
 #include "shell/gui/envelope_editor.h"
 #include "shell/gui/file_panel.h"
@@ -18,7 +19,8 @@ class Program;
 // It draws from the program's state and posts commands; it never changes the song itself.
 class MainWindow {
 public:
-    explicit MainWindow(Program& program);
+    // renderer: where windows with pixels of their own make their textures.
+    MainWindow(Program& program, SDL_Renderer* renderer);
     void draw();
     // "Ondrel Tracker - song name", with " *" while the song has unsaved changes.
     std::string title() const;
@@ -39,6 +41,7 @@ private:
     BrowserPane browser_pane_;
     SampleEditor sample_editor_;
     EnvelopeEditor envelope_editor_;
+    AnalyserWindow analyser_window_;
 };
 
 }  // namespace ondrel

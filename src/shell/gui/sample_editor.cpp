@@ -243,6 +243,21 @@ void SampleEditor::waveform(Program& p, const p_s& s, ImVec2 size) {
     drag_ = Drag::None;
 }
 
+void SampleEditor::show_pitch(const p_s& s) {
+    if (pitch_of_ != s.data || pitch_length_ != s.length || pitch_rate_ != s.rate) {
+        pitch_of_ = s.data;
+        pitch_length_ = s.length;
+        pitch_rate_ = s.rate;
+        pitch_ = calcfft(s);
+    }
+    if (!pitch_.found) {
+        ImGui::TextDisabled("No pitch: the first 4096 frames are silent");
+        return;
+    }
+    ImGui::Text("Pitch %.1f Hz, nearest note %s %+.0f cents", pitch_.frequency, pitch_.note_name.c_str(),
+                pitch_.cents);
+}
+
 void SampleEditor::draw(Program& p) {
     const p_s* s = p.engine.bank.song_sample(p.engine.player.cursor.cursnd);
     toolbar(p, s);
@@ -252,12 +267,14 @@ void SampleEditor::draw(Program& p) {
     }
     const ImVec2 room = ImGui::GetContentRegionAvail();
     waveform(p, *s, ImVec2(room.x, std::max(40.0f, room.y - ImGui::GetFrameHeightWithSpacing())));
-    // The scroll bar under the waveform, when the view is zoomed in.
+    // Under the waveform: the pitch, and the scroll bar when the view is zoomed in.
+    show_pitch(*s);
     const uint32_t frames = sound_frames(s);
     const double visible = per_pixel_ * room.x;
     if (visible < frames) {
         float start = float(first_);
-        ImGui::SetNextItemWidth(room.x);
+        ImGui::SameLine(0, 16);
+        ImGui::SetNextItemWidth(ImGui::GetContentRegionAvail().x);
         if (ImGui::SliderFloat("##scroll", &start, 0.0f, float(frames - visible), "frame %.0f"))
             first_ = start;
     }

@@ -4,6 +4,8 @@
 #include <cstdint>
 #include <vector>
 
+#include "shell/sound_pitch.h"
+
 namespace ondrel {
 
 class Program;
@@ -22,6 +24,7 @@ private:
     void toolbar(Program& p, const p_s* s);
     void waveform(Program& p, const p_s& s, ImVec2 size);
     void compute_peaks(const p_s& s, int width);
+    void show_pitch(const p_s& s);
     double frame_at(float x, float left) const;
     float x_of(double frame, float left) const;
 
@@ -37,6 +40,10 @@ private:
     const void* peaks_of_ = nullptr;
     double peaks_first_ = -1, peaks_per_pixel_ = -1;
     std::vector<float> low_[2], high_[2];
+    // The sound's dominant frequency, found again only when the sound changes.
+    const void* pitch_of_ = nullptr;
+    uint32_t pitch_length_ = 0, pitch_rate_ = 0;
+    SoundPitch pitch_;
 };
 
 }  // namespace ondrel

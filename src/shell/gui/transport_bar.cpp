@@ -5,36 +5,11 @@
 #include <algorithm>
 #include <cstdio>
 
-#include "shell/command_table.h"
 #include "shell/gui/pane.h"
+#include "shell/gui/widgets.h"
 #include "shell/program.h"
 
 namespace ondrel {
-
-namespace {
-
-void command_button(Program& p, uint32_t code, const char* label, bool lit = false) {
-    if (lit) ImGui::PushStyleColor(ImGuiCol_Button, ImVec4(0.20f, 0.45f, 0.25f, 1));
-    if (ImGui::Button(label)) p.post(code);
-    if (lit) ImGui::PopStyleColor();
-    if (ImGui::IsItemHovered()) {
-        if (const CommandInfo* c = find_command(code); c && !c->shortcut.empty())
-            ImGui::SetTooltip("%s", chord_text(c->shortcut).c_str());
-    }
-    ImGui::SameLine();
-}
-
-void meter(const char* label, float value) {
-    ImGui::TextUnformatted(label);
-    ImGui::SameLine();
-    const ImVec4 colour = value >= 1.0f ? ImVec4(0.9f, 0.2f, 0.2f, 1) : ImVec4(0.3f, 0.8f, 0.35f, 1);
-    ImGui::PushStyleColor(ImGuiCol_PlotHistogram, colour);
-    ImGui::ProgressBar(std::clamp(value, 0.0f, 1.0f), ImVec2(90, ImGui::GetTextLineHeight()), "");
-    ImGui::PopStyleColor();
-    ImGui::SameLine();
-}
-
-}  // namespace
 
 float draw_transport_bar(Program& p, const TMOD& song, float top) {
     const ImGuiViewport* view = ImGui::GetMainViewport();
@@ -44,8 +19,11 @@ float draw_transport_bar(Program& p, const TMOD& song, float top) {
     const Transport& tr = player.tr;
     const bool playing = tr.playing != 0;
     command_button(p, fourcc("PLsg"), "Play Song", playing && !tr.playp);
+    ImGui::SameLine();
     command_button(p, fourcc("PLpt"), "Play Pattern", playing && tr.playp);
+    ImGui::SameLine();
     command_button(p, fourcc("PLst"), "Stop");
+    ImGui::SameLine();
     bool loop = tr.floop != 0;
     if (ImGui::Checkbox("loop", &loop)) p.post(fourcc("PLlp"));
     ImGui::SameLine(0, 24);
@@ -58,8 +36,10 @@ float draw_transport_bar(Program& p, const TMOD& song, float top) {
     ImGui::Text("BPM %u  Speed %d", song.tempo ? 60000000u / song.tempo : 0u, int(song.speed));
     ImGui::SameLine(0, 24);
     const Mixer& mixer = p.engine.mixer;
-    meter("L", mixer.lmax.load(std::memory_order_relaxed));
-    meter("R", mixer.rmax.load(std::memory_order_relaxed));
+    level_meter("L", mixer.lmax.load(std::memory_order_relaxed));
+    ImGui::SameLine();
+    level_meter("R", mixer.rmax.load(std::memory_order_relaxed));
+    ImGui::SameLine();
     ImGui::Text("Load %3.0f%%", 100.0f * mixer.powermusic.load(std::memory_order_relaxed));
 
     const int instrument = player.cursor.cursnd + 1;

@@ -6,6 +6,9 @@
 #include <cstdio>
 #include <map>
 
+#include "shell/command_table.h"
+#include "shell/program.h"
+
 namespace ondrel {
 
 namespace {
@@ -77,6 +80,27 @@ bool mask_field(const char* label, bool& any, int& value, int high) {
     ImGui::EndDisabled();
     ImGui::PopID();
     return changed;
+}
+
+void command_button(Program& p, uint32_t code, const char* label, bool lit) {
+    const CommandInfo* c = find_command(code);
+    const bool can = c && c->handler && (!c->enabled || c->enabled(p));
+    if (lit) ImGui::PushStyleColor(ImGuiCol_Button, ImVec4(0.20f, 0.45f, 0.25f, 1));
+    ImGui::BeginDisabled(!can);
+    if (ImGui::Button(label)) p.post(code);
+    ImGui::EndDisabled();
+    if (lit) ImGui::PopStyleColor();
+    if (c && !c->shortcut.empty() && ImGui::IsItemHovered())
+        ImGui::SetTooltip("%s", chord_text(c->shortcut).c_str());
+}
+
+void level_meter(const char* label, float value, float width) {
+    ImGui::TextUnformatted(label);
+    ImGui::SameLine();
+    const ImVec4 colour = value >= 1.0f ? ImVec4(0.9f, 0.2f, 0.2f, 1) : ImVec4(0.3f, 0.8f, 0.35f, 1);
+    ImGui::PushStyleColor(ImGuiCol_PlotHistogram, colour);
+    ImGui::ProgressBar(std::clamp(value, 0.0f, 1.0f), ImVec2(width, ImGui::GetTextLineHeight()), "");
+    ImGui::PopStyleColor();
 }
 
 }  // namespace ondrel
