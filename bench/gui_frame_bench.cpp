@@ -85,7 +85,7 @@ int main() {
     }
     SdlAudioOutput audio(program.engine.mixer, program.engine.player, program.engine.bank);
     const bool sound = audio.open(512, why);
-    MainWindow window(program);
+    MainWindow window(program, host.renderer());
     measure_frames(host, program, window, 30);  // fonts, first layouts
 
     const Figures still = measure_frames(host, program, window, 300);

@@ -11,6 +11,11 @@ cat > "$home/shoot.sh" <<'INNER'
 #!/usr/bin/env bash
 set -euo pipefail
 out=$1
+# The browser opens on the corpus of modules where there is one, else on the project.
+mkdir -p "$2/config/ondrel"
+browse=$PWD/../shared/corpus/mod
+[ -d "$browse" ] || browse=$PWD
+printf '<Path>%s\n' "$browse" > "$2/config/ondrel/ondrel.txt"
 HOME=$2 XDG_CONFIG_HOME=$2/config XDG_STATE_HOME=$2/state SDL_AUDIODRIVER=dummy ONDREL_RENDERER=software \
   build/ondrel build/demo.otm &
 pid=$!
@@ -21,6 +26,10 @@ for _ in $(seq 50); do
 done
 xdotool windowfocus --sync "$wid"
 sleep 1
+# The Sample tab, to show a waveform (a pointer warp alone is no motion to SDL here).
+xdotool mousemove --window "$wid" 415 502 mousemove_relative 1 0
+sleep 0.3
+xdotool mousedown 1 && sleep 0.15 && xdotool mouseup 1
 xdotool key --window "$wid" F5
 sleep 2.5
 import -window root "$out"
