@@ -108,8 +108,9 @@ void GuiHost::handle_event(Program& program, const SDL_Event& event) {
             break;
         }
         case SDL_KEYDOWN:
-            if (!io.WantCaptureKeyboard && !io.WantTextInput && program.alerts.empty() &&
-                !program.file_panel.open())
+            // Only a text field being typed in keeps keys from the program: a button still
+            // held from a click a moment ago must not swallow the next key.
+            if (!io.WantTextInput && program.alerts.empty() && !program.file_panel.open())
                 program.key_down(chord_of(event.key.keysym), event.key.repeat != 0);
             break;
         case SDL_KEYUP:

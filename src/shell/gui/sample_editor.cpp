@@ -70,6 +70,11 @@ void SampleEditor::compute_peaks(const p_s& s, int width) {
             low_[c][size_t(x)] = lo;
             high_[c][size_t(x)] = hi;
         }
+        // Each column reaches its neighbour's range, so a steep slope draws unbroken.
+        for (size_t x = low_[c].size(); x-- > 1;) {
+            low_[c][x] = std::min(low_[c][x], high_[c][x - 1]);
+            high_[c][x] = std::max(high_[c][x], low_[c][x - 1]);
+        }
     }
 }
 
@@ -111,13 +116,8 @@ void SampleEditor::toolbar(Program& p, const p_s* s) {
     if (ImGui::Button("All")) per_pixel_ = 0;
     if (!sound) return;
     ImGui::SameLine(0, 16);
-    if (sel.whole())
-        ImGui::TextDisabled("No selection: the tools act on the whole sound (drag to select)");
-    else
-        ImGui::Text("Selection %u - %u (%u frames)", sel.first, sel.end, sel.end - sel.first);
-    ImGui::SameLine(0, 16);
     ImGui::BeginDisabled(sel.whole());
-    if (ImGui::Button("Loop it"))
+    if (ImGui::Button("Loop the selection"))
         p.post(ShellMessage(fourcc("SNlp")).with("on", 1).with("start", sel.first).with("end", sel.end));
     ImGui::EndDisabled();
     ImGui::SameLine(0, 16);
@@ -128,9 +128,16 @@ void SampleEditor::toolbar(Program& p, const p_s* s) {
         ImGui::EndCombo();
     }
     ImGui::SameLine();
-    if (ImGui::Button("Set from selection")) p.post(ShellMessage(fourcc("SNbk")).with("block", block_));
+    if (ImGui::Button("Set")) p.post(ShellMessage(fourcc("SNbk")).with("block", block_));
+    if (ImGui::IsItemHovered())
+        ImGui::SetTooltip("The block becomes the selection (the whole sound without one)");
     ImGui::SameLine();
-    if (ImGui::Button("Clear block")) p.post(ShellMessage(fourcc("SNbc")).with("block", block_));
+    if (ImGui::Button("Clear")) p.post(ShellMessage(fourcc("SNbc")).with("block", block_));
+    ImGui::SameLine(0, 16);
+    if (sel.whole())
+        ImGui::TextDisabled("No selection: tools act on the whole sound");
+    else
+        ImGui::Text("Selection %u - %u (%u frames)", sel.first, sel.end, sel.end - sel.first);
 }
 
 void SampleEditor::waveform(Program& p, const p_s& s, ImVec2 size) {
@@ -153,8 +160,8 @@ void SampleEditor::waveform(Program& p, const p_s& s, ImVec2 size) {
         const float half = lane * 0.45f;
         dl->AddLine(ImVec2(at.x, mid), ImVec2(at.x + size.x, mid), kCentre);
         for (int x = 0; x < width; ++x)
-            dl->AddLine(ImVec2(at.x + x, mid - high_[c][size_t(x)] * half),
-                        ImVec2(at.x + x, mid - low_[c][size_t(x)] * half + 1), kWave);
+            dl->AddRectFilled(ImVec2(at.x + x, mid - high_[c][size_t(x)] * half),
+                              ImVec2(at.x + x + 1, mid - low_[c][size_t(x)] * half + 1), kWave);
     }
 
     const FrameRange sel = p.editor.sound_selection;
