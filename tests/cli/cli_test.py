@@ -26,35 +26,10 @@ def json_report(path):
     return json.loads(r.stdout)
 
 
-SONG_KEYS = {"name", "tempo", "speed", "nbpos", "repeat", "nbtrack", "format", "globalvol",
-             "sequence", "trackpan", "trackpan2", "trackvol", "trackc", "tracke", "nbvoice",
-             "trackword1", "rows", "patterns", "samples", "efx"}
-SAMPLE_KEYS = {"index", "name", "rate", "length", "loopstart", "loopend", "loopon", "refnote",
-               "volume", "bits", "stereo", "framecode", "finetune", "level", "setting",
-               "flagword", "envelope", "crc32"}
-
-# The demo song, as scripts see it.
+# The demo song, as scripts see it (its fields are checked against an expected file by
+# the cli test program).
 demo = json_report(DEMO)
-check("song keys", set(demo) == SONG_KEYS, sorted(set(demo) ^ SONG_KEYS))
 check("demo name", demo["name"] == "Ondrel Morning", demo["name"])
-check("sequence length", len(demo["sequence"]) == demo["nbpos"])
-for key in ("trackpan", "trackpan2", "trackvol", "trackc", "tracke", "nbvoice", "trackword1"):
-    check(f"{key} entries", len(demo[key]) == 64, len(demo[key]))
-check("rows entries", len(demo["rows"]) == 128)
-check("efx keys", set(demo["efx"]) == {"echolen", "echolevel", "echoon", "efxflag", "efxa", "efxb", "efxc"})
-check("patterns", [p["index"] for p in demo["patterns"]] == [0, 1, 2, 3])
-for p in demo["patterns"]:
-    check("pattern keys", set(p) == {"index", "rows", "tracks", "cells"}, p.keys())
-    for cell in p["cells"]:
-        row, track = cell[0], cell[1]
-        check("cell in pattern", 0 <= row < p["rows"] and 0 <= track < p["tracks"], cell)
-        check("cell not empty", any(cell[2:]), cell)
-check("samples", len(demo["samples"]) == 6)
-for s in demo["samples"]:
-    check("sample keys", set(s) == SAMPLE_KEYS, sorted(set(s) ^ SAMPLE_KEYS))
-    check("sample index 1-based", 1 <= s["index"] <= 127)
-    check("envelope words", len(s["envelope"]) == 25)
-    check("crc of data", s["crc32"] != 0 or s["length"] == 0, s)
 
 # Text report.
 r = run("info", DEMO)
@@ -193,7 +168,6 @@ if os.path.exists(wav_path):
     r = run("info", "--json", wav_path)
     check("sound info exit", r.returncode == 0, r.stderr)
     sound = json.loads(r.stdout)
-    check("sound keys", set(sound) == SAMPLE_KEYS, sorted(set(sound) ^ SAMPLE_KEYS))
     check("sound named after its file", sound["name"] == "buzz", sound["name"])
     check("sound rate", sound["rate"] == 22050)
     with tempfile.TemporaryDirectory() as tmp:

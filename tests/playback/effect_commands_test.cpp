@@ -1,3 +1,5 @@
+#include <array>
+
 #include "song_fixture.h"
 
 namespace ondrel {
@@ -9,38 +11,77 @@ protected:
         make_song(4, {0, 1});
         add_sample(1, 40, 0);
     }
+    float period(int note) const { return floatnote()[note]; }
 };
 
-TEST_F(Commands, SpeedAndTempo) {
-    put(0, 0, 0, 0, 0, 15, 32);
-    put(0, 0, 1, 0, 0, 15, 0);  // nothing
-    play();
-    calls(1);
-    EXPECT_EQ(song().tempo, 1875000u);
-    EXPECT_EQ(song().speed, 6);
-    put(0, 1, 0, 0, 0, 15, 31);
-    calls(11 + 1);
-    EXPECT_EQ(song().speed, 31);
+enum Field { kVolume, kActive, kPeriod, kBase, kPosition, kTempo, kSpeed, kTrackVol, kGlobal, kPans };
+
+// What a few cells of track 0 leave after a number of sequencer calls (12 a row at speed
+// 6; the first call of a row is its tick 0).
+struct Case {
+    const char* what;
+    std::vector<std::array<int, 6>> cells;  // row, note, instrument, command, parameter, volume
+    int calls;
+    Field field;
+    double want;
+};
+
+TEST_F(Commands, CellsLeaveTheirValues) {
+    const float p48 = period(48);
+    const Case cases[] = {
+        {"F 32: tempo in BPM", {{0, 0, 0, 15, 32, 0}}, 1, kTempo, 1875000},
+        {"F 0: nothing", {{0, 0, 0, 15, 0, 0}}, 1, kSpeed, 6},
+        {"F 31: speed", {{1, 0, 0, 15, 31, 0}}, 13, kSpeed, 31},
+        {"slide up on the first tick", {{0, 48, 1, 1, 2, 0}}, 1, kBase, p48 - 2},
+        {"and on each of six", {{0, 48, 1, 1, 2, 0}}, 12, kBase, p48 - 12},
+        {"E5x without a note: no period", {{0, 48, 1, 0, 0, 0}, {1, 0, 0, 14, 0x53, 0}}, 13, kPeriod, 0},
+        {"C 0x50: no upper clamp", {{0, 48, 1, 12, 0x50, 0}}, 1, kVolume, 160},
+        {"A 0x30 slides up to 128", {{0, 48, 1, 12, 0x50, 0}, {1, 0, 0, 10, 0x30, 0}}, 13, kVolume, 128},
+        {"A 0x05 slides down each tick", {{0, 48, 1, 12, 0x40, 0}, {1, 0, 0, 10, 5, 0}}, 24, kVolume, 68},
+        {"5 0x12: the whole byte slides up", {{0, 48, 1, 12, 5, 0}, {1, 0, 0, 5, 0x12, 0}}, 13, kVolume, 46},
+        {"6 0x0F slides down", {{0, 48, 1, 12, 0x40, 0}, {1, 0, 0, 6, 0x0F, 0}}, 13, kVolume, 98},
+        {"EA5 fine up", {{0, 48, 1, 14, 0xA5, 0}}, 1, kVolume, 50},
+        {"EB9 fine down", {{0, 48, 1, 14, 0xB9, 0}}, 1, kVolume, 22},
+        {"EC2 keeps the volume on tick 1", {{0, 48, 1, 14, 0xC2, 0}}, 4, kVolume, 40},
+        {"and cuts on tick 2", {{0, 48, 1, 14, 0xC2, 0}}, 5, kVolume, 0},
+        {"ED2 waits on tick 1", {{0, 48, 1, 14, 0xD2, 100}}, 4, kActive, 0},
+        {"and starts on tick 2, cell volume", {{0, 48, 1, 14, 0xD2, 100}}, 5, kVolume, 100},
+        {"26 3 waits three half-ticks", {{0, 50, 1, 26, 3, 0}}, 3, kActive, 0},
+        {"and starts on the fourth", {{0, 50, 1, 26, 3, 0}}, 4, kVolume, 40},
+        {"26 0 does not wait", {{0, 50, 1, 26, 0, 0}}, 1, kActive, 1},
+        {"9 0x10: sample offset", {{0, 48, 1, 9, 0x10, 0}}, 1, kPosition, 0x1000},
+        {"8 100: track volume", {{0, 0, 0, 8, 100, 0}}, 1, kTrackVol, 50},
+        {"16 200: global volume", {{0, 0, 0, 16, 200, 0}}, 1, kGlobal, 200},
+        {"22 90: both pans", {{0, 0, 0, 22, 90, 0}}, 1, kPans, 90090},
+        {"21 10: first pan", {{0, 0, 0, 21, 10, 0}}, 1, kPans, 128010},
+        {"27 20: second pan", {{0, 0, 0, 27, 20, 0}}, 1, kPans, 20128},
+    };
+    for (const Case& c : cases) {
+        make_song(4, {0, 1});
+        for (const auto& [row, note, instrument, command, parameter, volume] : c.cells)
+            put(0, row, 0, note, instrument, command, parameter, volume);
+        play();
+        calls(c.calls);
+        const Voice& v = voice(0);
+        const TMOD& m = song();
+        const double pans = m.trackpan[0] + m.trackpan2[0] * 1000.0;
+        const double values[] = {1.0 * v.volume,    1.0 * v.active,
+                                 v.period,          v.baseperiod,
+                                 1.0 * v.position,  1.0 * m.tempo,
+                                 1.0 * m.speed,     1.0 * m.trackvol[0],
+                                 1.0 * m.globalvol, pans};
+        EXPECT_FLOAT_EQ(values[c.field], c.want) << c.what;
+        player.stoppi();
+        set_new_song_defaults(song(), 0);
+    }
 }
 
-TEST_F(Commands, FinetuneOnARowWithoutANoteZeroesThePeriod) {
-    put(0, 0, 0, 48, 1);
-    put(0, 1, 0, 0, 0, 14, 0x53);
-    play();
-    rows(1);
-    EXPECT_GT(voice(0).period, 0.0f);
-    calls(1);
-    EXPECT_EQ(voice(0).finetune, 3);
-    EXPECT_EQ(voice(0).period, 0.0f);
-    EXPECT_EQ(voice(0).baseperiod, 0.0f);
-}
-
-TEST_F(Commands, FinetuneWithANoteUsesTheFactor) {
-    put(0, 0, 0, 48, 1, 14, 0x58);
+TEST_F(Commands, FinetuneLowersThePitchBelowTheNextSemitone) {
+    put(0, 0, 0, 48, 1, 14, 0x58);  // 8: 7/8 of a semitone down
     play();
     calls(1);
-    EXPECT_FLOAT_EQ(voice(0).period, period_of(48, 8));
-    EXPECT_GT(voice(0).period, floatnote()[48]);  // 8 lowers the pitch by 7/8 semitone
+    EXPECT_GT(voice(0).period, period(48));
+    EXPECT_LT(voice(0).period, period(47));
 }
 
 TEST_F(Commands, SlidesStopAtThePeriodLimits) {
@@ -67,19 +108,19 @@ TEST_F(Commands, SlidesStopAtThePeriodLimits) {
     EXPECT_EQ(voice(0).baseperiod, 102.0f);
 }
 
-TEST_F(Commands, SlidesAlreadyActOnTheFirstTick) {
-    put(0, 0, 0, 48, 1, 1, 2);
+TEST_F(Commands, VibratoDepthAndMemory) {
+    put(0, 0, 0, 48, 1, 4, 0x83);
+    put(0, 1, 0, 0, 0, 4, 0x00);  // keeps speed and depth
+    put(0, 2, 0, 0, 0, 4, 0x05);  // 15 or less: a new depth, the speed stays
+    for (int r = 3; r < 64; ++r) put(0, r, 0, 0, 0, 4, 0xFF);
     play();
     calls(1);
-    EXPECT_FLOAT_EQ(voice(0).baseperiod, floatnote()[48] - 2);
-    calls(11);
-    EXPECT_FLOAT_EQ(voice(0).baseperiod, floatnote()[48] - 12);  // six ticks
-}
-
-TEST_F(Commands, VibratoDepthFifteenMovesAtMost29) {
-    put(0, 0, 0, 48, 1);
-    for (int r = 1; r < 64; ++r) put(0, r, 0, 0, 0, 4, 0xFF);
-    play();
+    EXPECT_EQ(voice(0).vibparam, 0x83);
+    EXPECT_EQ(voice(0).vibpos, 32);
+    rows(1);
+    EXPECT_EQ(voice(0).vibparam, 0x83);
+    rows(1);
+    EXPECT_EQ(voice(0).vibparam, 0x85);
     rows(1);
     const float base = voice(0).baseperiod;
     float lo = base, hi = base;
@@ -89,22 +130,9 @@ TEST_F(Commands, VibratoDepthFifteenMovesAtMost29) {
         hi = std::max(hi, voice(0).period);
         EXPECT_EQ(voice(0).baseperiod, base);
     }
+    // Depth 15 swings a sine of peak 255 by 15/128 of it, truncated: 29 each way.
     EXPECT_EQ(hi - base, 29.0f);
     EXPECT_EQ(base - lo, 29.0f);
-}
-
-TEST_F(Commands, VibratoKeepsItsSpeedAndDepthBetweenRows) {
-    put(0, 0, 0, 48, 1, 4, 0x83);
-    put(0, 1, 0, 0, 0, 4, 0x00);
-    put(0, 2, 0, 0, 0, 4, 0x05);
-    play();
-    calls(1);
-    EXPECT_EQ(voice(0).vibparam, 0x83);
-    EXPECT_EQ(voice(0).vibpos, 32);
-    calls(11 + 1);
-    EXPECT_EQ(voice(0).vibparam, 0x83);
-    calls(11 + 1);
-    EXPECT_EQ(voice(0).vibparam, 0x85);  // a parameter of 15 or less leaves the speed
 }
 
 TEST_F(Commands, TonePortamentoReachesItsTargetExactly) {
@@ -113,12 +141,11 @@ TEST_F(Commands, TonePortamentoReachesItsTargetExactly) {
     for (int r = 2; r < 20; ++r) put(0, r, 0, 0, 0, 3, 0);
     play();
     rows(1);
-    const float from = voice(0).baseperiod;
     calls(1);  // the target is set, nothing retriggers, and the first tick already slides
     EXPECT_EQ(voice(0).note, 48);
-    EXPECT_FLOAT_EQ(voice(0).baseperiod, from - 40);
+    EXPECT_FLOAT_EQ(voice(0).baseperiod, period(48) - 40);
     rows(10);
-    EXPECT_FLOAT_EQ(voice(0).baseperiod, period_of(60));
+    EXPECT_FLOAT_EQ(voice(0).baseperiod, period(60));
     EXPECT_EQ(voice(0).portatarget, 0.0f);
     EXPECT_EQ(voice(0).portaspeed, 40);
 }
@@ -126,97 +153,13 @@ TEST_F(Commands, TonePortamentoReachesItsTargetExactly) {
 TEST_F(Commands, ArpeggioCyclesWithTheSpeed) {
     put(0, 0, 0, 48, 1, 0, 0x47);
     play();
-    std::vector<float> seen;
+    // (speed - tick) mod 3: ticks 0 and 3 the note, 1 and 4 the note + y, 2 and 5 + x.
+    const int notes[] = {48, 55, 52, 48, 55, 52};
     for (int tick = 0; tick < 6; ++tick) {
         calls(1);
-        seen.push_back(voice(0).period);
+        EXPECT_FLOAT_EQ(voice(0).period, period(notes[tick])) << tick;
         calls(1);
     }
-    // (speed - tick) mod 3: ticks 0, 3 base; 1, 4 the y note; 2, 5 the x note.
-    const std::vector<float> want = {period_of(48), period_of(55), period_of(52),
-                                     period_of(48), period_of(55), period_of(52)};
-    for (int i = 0; i < 6; ++i) EXPECT_FLOAT_EQ(seen[i], want[i]) << i;
-}
-
-TEST_F(Commands, VolumeCommands) {
-    put(0, 0, 0, 48, 1, 12, 0x50);  // no upper clamp
-    play();
-    calls(1);
-    EXPECT_EQ(voice(0).volume, 160);
-    put(0, 1, 0, 0, 0, 10, 0x30);
-    calls(11 + 1);
-    EXPECT_EQ(voice(0).volume, 128);  // +6 a tick from 160, clamped
-    put(0, 2, 0, 0, 0, 10, 0x05);
-    calls(11 + 12);
-    EXPECT_EQ(voice(0).volume, 128 - 6 * 10);
-    voice(0).volume = 10;
-    put(0, 3, 0, 0, 0, 5, 0x12);  // 18 > 15: the whole byte slides up
-    calls(1 + 1);
-    EXPECT_EQ(voice(0).volume, 10 + 36);
-    put(0, 4, 0, 0, 0, 6, 0x0F);
-    calls(11 + 1);
-    EXPECT_EQ(voice(0).volume, 98);  // up to 128 by the end of row 3, then down 30
-}
-
-TEST_F(Commands, FineVolumeAndNoteCut) {
-    put(0, 0, 0, 48, 1, 14, 0xA5);
-    play();
-    calls(1);
-    EXPECT_EQ(voice(0).volume, 50);
-    put(0, 1, 0, 0, 0, 14, 0xB9);
-    calls(11 + 1);
-    EXPECT_EQ(voice(0).volume, 32);
-    put(0, 2, 0, 0, 0, 14, 0xC2);
-    calls(11 + 4);
-    EXPECT_EQ(voice(0).volume, 32);
-    calls(1);  // tick 2
-    EXPECT_EQ(voice(0).volume, 0);
-}
-
-TEST_F(Commands, NoteDelayTriggersOnItsTick) {
-    put(0, 0, 0, 48, 1, 14, 0xD2, 100);
-    play();
-    calls(1);
-    EXPECT_EQ(voice(0).active, 0);
-    calls(3);
-    EXPECT_EQ(voice(0).active, 0);
-    calls(1);  // notick 4: tick 2
-    EXPECT_EQ(voice(0).active, 1);
-    EXPECT_EQ(voice(0).note, 48);
-    EXPECT_EQ(voice(0).volume, 100);
-}
-
-TEST_F(Commands, HalfTickDelayUsesOddCallsToo) {
-    put(0, 0, 0, 50, 1, 26, 3);
-    play();
-    calls(3);
-    EXPECT_EQ(voice(0).active, 0);
-    calls(1);  // the call with notick 3
-    EXPECT_EQ(voice(0).active, 1);
-    EXPECT_EQ(voice(0).volume, 40);
-    put(0, 1, 1, 52, 1, 26, 0);  // 0: no delay
-    calls(8 + 1);
-    EXPECT_EQ(voice(1).active, 1);
-}
-
-TEST_F(Commands, SampleOffsetAndTrackWords) {
-    put(0, 0, 0, 48, 1, 9, 0x10);
-    put(0, 0, 1, 0, 0, 8, 100);
-    put(0, 0, 2, 0, 0, 16, 200);
-    put(0, 0, 3, 0, 0, 22, 90);
-    put(0, 1, 0, 0, 0, 21, 10);
-    put(0, 1, 1, 0, 0, 27, 20);
-    play();
-    calls(1);
-    EXPECT_EQ(voice(0).position, 0x1000u);
-    EXPECT_EQ(song().trackvol[1], 50);
-    EXPECT_EQ(song().globalvol, 200);
-    EXPECT_EQ(song().trackpan[3], 90);
-    EXPECT_EQ(song().trackpan2[3], 90);
-    rows(1);
-    EXPECT_EQ(song().trackpan[0], 10);
-    EXPECT_EQ(song().trackpan2[0], 128);
-    EXPECT_EQ(song().trackpan2[1], 20);
 }
 
 TEST_F(Commands, SampleBlocks) {
@@ -256,22 +199,6 @@ TEST_F(Commands, EffectSlotRoutingAndSendLevels) {
     EXPECT_EQ(song().trackc[0], 77);
     EXPECT_EQ(song().trackc[3], 77);
     EXPECT_EQ(song().trackc[2], 128);
-}
-
-TEST_F(Commands, NoteDelayAtTickZeroTriggersInBothPasses) {
-    test::SongFixture::song().trackword1[0] = 1;
-    struct Count : MidiOut {
-        int on = 0;
-        void NoteOn(uint8_t, uint8_t, uint8_t, uint64_t) override { ++on; }
-        void NoteOff(uint8_t, uint8_t, uint8_t, uint64_t) override {}
-        void ProgramChange(uint8_t, uint8_t, uint64_t) override {}
-    } out;
-    player.papi = &out;
-    put(0, 0, 0, 48, 1, 14, 0xD0);
-    play();
-    calls(1);
-    EXPECT_EQ(out.on, 2);
-    player.papi = nullptr;
 }
 
 }  // namespace

@@ -1,4 +1,3 @@
-#include <cstdio>
 #include <string>
 
 #include "song_fixture.h"
@@ -10,21 +9,18 @@ namespace {
 class RecordingMidi : public MidiOut {
 public:
     std::vector<std::string> sent;
-    void NoteOn(uint8_t c, uint8_t n, uint8_t v, uint64_t) override { add("on", c, n, v); }
-    void NoteOff(uint8_t c, uint8_t n, uint8_t v, uint64_t) override { add("off", c, n, v); }
-    void ProgramChange(uint8_t c, uint8_t p, uint64_t) override { add("program", c, p, -1); }
+    void NoteOn(uint8_t c, uint8_t n, uint8_t v, uint64_t) override { add("on", {c, n, v}); }
+    void NoteOff(uint8_t c, uint8_t n, uint8_t v, uint64_t) override { add("off", {c, n, v}); }
+    void ProgramChange(uint8_t c, uint8_t p, uint64_t) override { add("program", {c, p}); }
 
 private:
-    void add(const char* what, int c, int a, int b) {
-        char line[64];
-        if (b >= 0)
-            std::snprintf(line, sizeof line, "%s %d %d %d", what, c, a, b);
-        else
-            std::snprintf(line, sizeof line, "%s %d %d", what, c, a);
+    void add(std::string line, std::initializer_list<int> values) {
+        for (int v : values) line += " " + std::to_string(v);
         sent.push_back(line);
     }
 };
 
+// Track 0 sends to channel 3; sample 1 has volume 64, sample 2 volume 0.
 class MidiSending : public test::SongFixture {
 protected:
     RecordingMidi midi;
@@ -37,36 +33,44 @@ protected:
     }
 };
 
-TEST_F(MidiSending, NotesGoToTheChannelInsteadOfTheSampleVoice) {
-    put(0, 0, 0, 60, 1);
-    put(0, 1, 0, 62, 0, 0, 0, 32);
-    play();
-    calls(1);
-    EXPECT_EQ(voice(0).active, 0);
-    EXPECT_EQ(tr.notesended[0], 61);
-    rows(1);
-    EXPECT_EQ(midi.sent, (std::vector<std::string>{"on 3 60 63", "off 3 60 100", "on 3 62 31"}));
-}
-
-TEST_F(MidiSending, VolumeZeroIsSentAsFullVelocity) {
-    put(0, 0, 0, 60, 2);  // sample 2 has volume 0
-    play();
-    calls(1);
-    EXPECT_EQ(midi.sent, (std::vector<std::string>{"on 3 60 127"}));
-}
-
-TEST_F(MidiSending, ProgramChangesArriveOneChangeLate) {
-    put(0, 0, 0, 60, 1);
-    put(0, 1, 0, 60, 2);
-    put(0, 2, 0, 60, 2);
-    put(0, 3, 0, 60, 1);
-    play();
-    rows(4);
-    std::vector<std::string> programs;
-    for (const auto& s : midi.sent)
-        if (s.rfind("program", 0) == 0) programs.push_back(s);
-    EXPECT_EQ(programs, (std::vector<std::string>{"program 3 1", "program 3 2"}));
-    EXPECT_EQ(tr.instsended[0], 2);
+TEST_F(MidiSending, WhatTheCellsSend) {
+    using Lines = std::vector<std::string>;
+    struct Case {
+        const char* what;
+        std::vector<test::Put> cells;
+        int calls;
+        Lines sent;
+    };
+    const Case cases[] = {
+        {"notes, the volume as velocity, the last note off first",
+         {{0, 0, 0, 60, 1}, {0, 1, 0, 62, 0, 0, 0, 32}},
+         13,
+         {"on 3 60 63", "off 3 60 100", "on 3 62 31"}},
+        {"volume 0 as full velocity", {{0, 0, 0, 60, 2}}, 1, {"on 3 60 127"}},
+        {"programs one change late",
+         {{0, 0, 0, 60, 1}, {0, 1, 0, 60, 2}, {0, 2, 0, 60, 2}, {0, 3, 0, 60, 1}},
+         37,
+         {"on 3 60 63", "program 3 1", "off 3 60 100", "on 3 60 127", "program 3 2", "off 3 60 100",
+          "on 3 60 127", "off 3 60 100", "on 3 60 63"}},
+        {"a note delay of 0 triggers in both passes",
+         {{0, 0, 0, 48, 1, 14, 0xD0}},
+         1,
+         {"on 3 48 63", "off 3 48 100", "on 3 48 63"}},
+        {"a track without a channel keeps its samples", {{0, 0, 1, 60, 1}}, 1, {}},
+    };
+    for (const Case& c : cases) {
+        make_song(2, {0});
+        for (const test::Put& p : c.cells) put(p);
+        midi.sent.clear();
+        play();
+        calls(c.calls);
+        EXPECT_EQ(midi.sent, c.sent) << c.what;
+        EXPECT_EQ(voice(0).active, 0) << c.what;  // the channel's notes start no sample voice
+        EXPECT_EQ(voice(1).active, c.cells[0].track == 1) << c.what;
+        player.stoppi();
+        tr.notesended[0] = tr.instsended[0] = 0;
+        voice(0).instrument = 0;
+    }
 }
 
 TEST_F(MidiSending, WithoutAnOutputTheSampleVoicePlays) {
@@ -76,14 +80,6 @@ TEST_F(MidiSending, WithoutAnOutputTheSampleVoicePlays) {
     calls(1);
     EXPECT_EQ(voice(0).active, 1);
     EXPECT_EQ(tr.notesended[0], 0);
-}
-
-TEST_F(MidiSending, TracksWithoutAChannelKeepTheirSamples) {
-    put(0, 0, 1, 60, 1);
-    play();
-    calls(1);
-    EXPECT_EQ(voice(1).active, 1);
-    EXPECT_TRUE(midi.sent.empty());
 }
 
 }  // namespace

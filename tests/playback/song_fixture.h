@@ -9,6 +9,11 @@
 
 namespace ondrel::test {
 
+// A cell to put in a song: where, and what.
+struct Put {
+    int pattern, row, track, note, instrument, command = 0, parameter = 0, volume = 0;
+};
+
 class SongFixture : public ::testing::Test {
 protected:
     Engine engine;
@@ -18,14 +23,16 @@ protected:
 
     TMOD& song() { return bank.current(); }
 
-    // A song of tracks tracks whose sequence plays patterns (each of rows rows).
+    // A song of tracks tracks whose sequence plays patterns (each of rows rows, else 64).
     void make_song(int tracks, std::vector<int> sequence, std::vector<int> rows = {}) {
         TMOD& m = song();
         m.nbtrack = static_cast<uint8_t>(tracks);
         m.nbpos = static_cast<uint8_t>(sequence.size());
-        for (size_t i = 0; i < sequence.size(); ++i) m.sequence[i] = static_cast<uint8_t>(sequence[i]);
         int patterns = 0;
-        for (int p : sequence) patterns = std::max(patterns, p + 1);
+        for (size_t i = 0; i < sequence.size(); ++i) {
+            m.sequence[i] = static_cast<uint8_t>(sequence[i]);
+            patterns = std::max(patterns, sequence[i] + 1);
+        }
         for (int p = 0; p < patterns; ++p) {
             m.rows[p] = static_cast<int16_t>(p < static_cast<int>(rows.size()) ? rows[p] : 64);
             bank.Gofree(m.patbase + p);
@@ -34,9 +41,9 @@ protected:
         bank.nbvoie = static_cast<int16_t>(tracks);
     }
 
-    // A sample in instrument slot instrument (1-based).
-    p_s& add_sample(int instrument, int volume = 64, int finetune = 0, uint32_t length = 1000) {
-        SampleRef s = make_sample(length);
+    // An 8-bit sample in instrument slot instrument (1-based).
+    p_s& add_sample(int instrument, int volume = 64, int finetune = 0) {
+        SampleRef s = make_sample(1000);
         s->bits = 8;
         s->rate = 8363;
         s->volume = static_cast<int16_t>(volume);
@@ -46,12 +53,17 @@ protected:
         return ref;
     }
 
-    TNOTE& cell(int pattern, int row, int track) { return bank.song_pattern(pattern)->col[track][row]; }
+    void put(const Put& c) {
+        bank.song_pattern(c.pattern)->col[c.track][c.row] = {static_cast<uint8_t>(c.note),
+                                                             static_cast<uint8_t>(c.volume),
+                                                             0,
+                                                             static_cast<uint8_t>(c.instrument),
+                                                             static_cast<uint8_t>(c.command),
+                                                             static_cast<uint8_t>(c.parameter)};
+    }
     void put(int pattern, int row, int track, int note, int instrument, int command = 0, int parameter = 0,
              int volume = 0) {
-        cell(pattern, row, track) = {
-            static_cast<uint8_t>(note),       static_cast<uint8_t>(volume),  0,
-            static_cast<uint8_t>(instrument), static_cast<uint8_t>(command), static_cast<uint8_t>(parameter)};
+        put({pattern, row, track, note, instrument, command, parameter, volume});
     }
 
     void play(bool pattern_mode = false) { player.start(pattern_mode); }
@@ -69,9 +81,6 @@ protected:
     }
 
     Voice& voice(int v) { return player.nlist[v]; }
-    static float period_of(int note, int finetune = 0) {
-        return finetune_factor(finetune) * floatnote()[note];
-    }
 };
 
 }  // namespace ondrel::test

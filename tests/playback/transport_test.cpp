@@ -24,31 +24,22 @@ TEST_F(Transport, RowsAdvanceEveryTwoSpeedCallsAndPositionsAfterTheLastRow) {
     EXPECT_EQ(tr.playing, 1);
 }
 
-TEST_F(Transport, SongEndStopsWithoutLoopAndResetsToTheRestart) {
-    make_song(1, {0, 1, 0}, {2, 2});
-    song().repeat = 1;
-    play();
-    rows(6);
-    EXPECT_EQ(tr.playing, 0);
-    EXPECT_EQ(tr.nopat, 1);
-    EXPECT_EQ(tr.nopos, 0);
-    EXPECT_EQ(window_messages(), std::vector<uint32_t>{kMsgStop});
-    calls(5);  // stopped: nothing moves
-    EXPECT_EQ(tr.nopat, 1);
-    EXPECT_EQ(tr.notick, 0);
-}
-
-TEST_F(Transport, SongEndWithLoopGoesOnFromTheRestart) {
-    make_song(1, {0, 1, 0}, {2, 2});
-    song().repeat = 1;
-    tr.floop = 1;
-    play();
-    rows(6);
-    EXPECT_EQ(tr.playing, 1);
-    EXPECT_EQ(tr.nopat, 1);
-    EXPECT_TRUE(window_messages().empty());
-    rows(2);
-    EXPECT_EQ(tr.nopat, 2);
+TEST_F(Transport, SongEndStopsOrGoesOnFromTheRestart) {
+    for (int loop : {0, 1}) {
+        make_song(1, {0, 1, 0}, {2, 2});
+        song().repeat = 1;
+        tr.floop = static_cast<uint8_t>(loop);
+        tr.nopat = 0;
+        play();
+        rows(6);
+        EXPECT_EQ(tr.playing, loop);
+        EXPECT_EQ(tr.nopat, 1);
+        EXPECT_EQ(tr.nopos, 0);
+        EXPECT_EQ(window_messages().size(), loop ? 0u : 1u);
+        rows(2);  // stopped: nothing moves
+        EXPECT_EQ(tr.nopat, loop ? 2 : 1);
+        player.stoppi();
+    }
 }
 
 TEST_F(Transport, PatternModeRepeatsOrStops) {
@@ -66,46 +57,32 @@ TEST_F(Transport, PatternModeRepeatsOrStops) {
     EXPECT_EQ(window_messages(), std::vector<uint32_t>{kMsgStop});
 }
 
-TEST_F(Transport, BreakBeyondTheTargetUsesTheRowCountOfThePatternLeft) {
-    make_song(1, {0, 1, 2}, {64, 32, 64});
-    put(0, 0, 0, 0, 0, 13, 0x50);  // row 50 of a 32-row pattern: kept, as 64 rows are left
-    play();
-    rows(1);
-    EXPECT_EQ(tr.nopat, 1);
-    EXPECT_EQ(tr.nopos, 50);
-    rows(1);  // leaving pattern 1 (32 rows) at row 51: wraps to the next position
-    EXPECT_EQ(tr.nopat, 2);
-    EXPECT_EQ(tr.nopos, 0);
-}
-
-TEST_F(Transport, BreakPastTheRowsLeftAdvancesOnceMore) {
-    make_song(1, {0, 1, 2}, {64, 64, 64});
-    put(0, 0, 0, 0, 0, 13, 0x70);  // row 70 exceeds the 64 rows of the pattern being left
-    play();
-    rows(1);
-    EXPECT_EQ(tr.nopat, 2);
-    EXPECT_EQ(tr.nopos, 0);
-}
-
-TEST_F(Transport, PositionJumpAndPatternBreakDecimalRow) {
-    make_song(1, {0, 1, 2, 3});
-    put(0, 0, 0, 0, 0, 11, 3);
-    play();
-    rows(1);
-    EXPECT_EQ(tr.nopat, 3);
-    EXPECT_EQ(tr.nopos, 0);
-    put(3, 0, 0, 0, 0, 13, 0x25);  // read as decimal 25, of the position after the last
-    rows(1);
-    EXPECT_EQ(tr.nopat, 0);  // past the end: back to the restart, and the song is over
-    EXPECT_EQ(tr.nopos, 25);
-    EXPECT_EQ(tr.playing, 0);
-    put(0, 0, 0, 0, 0, 13, 0x12);
-    tr.floop = 1;
-    player.start(false);
-    tr.nopos = 0;
-    rows(1);
-    EXPECT_EQ(tr.nopat, 1);
-    EXPECT_EQ(tr.nopos, 12);
+TEST_F(Transport, JumpsAndBreaks) {
+    struct Case {
+        const char* what;
+        std::vector<int> rows;  // of patterns 0, 1, 2, 3, played in order
+        int command, parameter, played_rows, nopat, nopos, playing;
+    };
+    const std::vector<int> short1 = {64, 32, 64, 64}, even = {64, 64, 64, 64};
+    const Case cases[] = {
+        {"break to row 50 of a 32-row pattern: kept, 64 are left", short1, 13, 0x50, 1, 1, 50, 1},
+        {"and leaving it at row 51 wraps to the next position", short1, 13, 0x50, 2, 2, 0, 1},
+        {"break past the rows of the pattern left: one more", even, 13, 0x70, 1, 2, 0, 1},
+        {"the break row is decimal", even, 13, 0x12, 1, 1, 12, 1},
+        {"position jump", even, 11, 3, 1, 3, 0, 1},
+        {"jump past the end ends the song", even, 11, 9, 1, 0, 0, 0},
+    };
+    for (const Case& c : cases) {
+        make_song(1, {0, 1, 2, 3}, c.rows);
+        put(0, 0, 0, 0, 0, c.command, c.parameter);
+        tr.nopat = 0;
+        play();
+        rows(c.played_rows);
+        EXPECT_EQ(tr.nopat, c.nopat) << c.what;
+        EXPECT_EQ(tr.nopos, c.nopos) << c.what;
+        EXPECT_EQ(tr.playing, c.playing) << c.what;
+        player.stoppi();
+    }
 }
 
 TEST_F(Transport, PatternDelayHoldsTheHalfTickWithoutRetrigger) {
@@ -144,18 +121,15 @@ TEST_F(Transport, SpeedOneRunsPerTickCommandsOncePerRow) {
 TEST_F(Transport, DisabledInstrumentSkipsTheCellWithItsCommands) {
     make_song(1, {0});
     add_sample(2);
-    song().patflag[1] = 0;
     put(0, 0, 0, 50, 2, 15, 3);
-    play();
-    calls(1);
-    EXPECT_EQ(voice(0).active, 0);
-    EXPECT_EQ(song().speed, 6);
-    song().patflag[1] = 1;
-    player.stoppi();
-    play();
-    calls(1);
-    EXPECT_EQ(voice(0).active, 1);
-    EXPECT_EQ(song().speed, 3);
+    for (int enabled : {0, 1}) {
+        song().patflag[1] = static_cast<uint8_t>(enabled);
+        play();
+        calls(1);
+        EXPECT_EQ(voice(0).active, enabled);
+        EXPECT_EQ(song().speed, enabled ? 3 : 6);
+        player.stoppi();
+    }
 }
 
 TEST_F(Transport, StartTakesTheCursorRowAndStopSilencesEveryVoice) {
@@ -167,7 +141,6 @@ TEST_F(Transport, StartTakesTheCursorRowAndStopSilencesEveryVoice) {
     calls(1);
     EXPECT_EQ(tr.nopos, 10);
     EXPECT_EQ(voice(1).active, 1);
-    EXPECT_EQ(player.polytour[1], 0);
     voice(200).active = 1;
     voice(200).block = 3;
     player.polytour[5] = 2;
@@ -200,48 +173,37 @@ TEST_F(Transport, StopHandsTheVoiceResetToARunningAudioThread) {
     player.audio_running = false;
 }
 
-TEST_F(Transport, SingleRowPlayStopsAfterOneRow) {
-    make_song(1, {0});
+TEST_F(Transport, SingleRowAndAuditions) {
+    make_song(3, {0, 1}, {8, 2});
+    add_sample(1);
     player.cursor.poscurv = 3;
     player.play_line();
     rows(1);
     EXPECT_EQ(tr.playing, 0);
     EXPECT_EQ(tr.fplayline, 0);
     EXPECT_EQ(tr.nopos, 3);
-}
 
-TEST_F(Transport, OneNoteAuditionPlaysOnlyTheCursorTrackWhenNotEditing) {
-    make_song(3, {0});
-    add_sample(1);
-    put(0, 0, 0, 48, 1);  // a note on another track of the row
-    tr.faccedit = 0;
-    player.audition_note({60, 0, 0, 1, 0, 0}, 2);
-    calls(1);
-    EXPECT_EQ(voice(2).active, 1);
-    EXPECT_EQ(voice(2).note, 60);
-    EXPECT_EQ(voice(0).active, 0);
-    EXPECT_EQ(tr.afpending, 0);
-    calls(11);
-    EXPECT_EQ(tr.fplayonenote, 0);  // ends with the row
-    EXPECT_EQ(tr.nopos, 0);
-}
-
-TEST_F(Transport, ChordEntryAuditionReadsTheWholeRow) {
-    make_song(3, {0});
-    add_sample(1);
+    // One note: only the cursor track when not editing, the whole row when entering chords.
     put(0, 0, 0, 48, 1);
-    tr.faccedit = 1;
-    player.audition_note({60, 0, 0, 1, 0, 0}, 2);
-    calls(1);
-    EXPECT_EQ(voice(2).active, 1);
-    EXPECT_EQ(voice(0).active, 1);
-}
+    for (int chord : {0, 1}) {
+        tr.nopos = 0;
+        voice(0).active = voice(2).active = 0;
+        tr.faccedit = static_cast<uint8_t>(chord);
+        player.audition_note({60, 0, 0, 1, 0, 0}, 2);
+        calls(1);
+        EXPECT_EQ(voice(2).note, 60);
+        EXPECT_EQ(voice(0).active, chord);
+        EXPECT_EQ(tr.afpending, 0);
+        calls(11);
+        EXPECT_EQ(tr.fplayonenote, 0);  // ends with the row
+        EXPECT_EQ(tr.nopos, 0);
+    }
 
-TEST_F(Transport, TrackAuditionReadsOneTrackAndStaysOnItsPosition) {
-    make_song(2, {0, 1}, {2, 2});
-    add_sample(1);
+    // One track of one position, which it stays on.
     put(1, 0, 0, 48, 1);
     put(1, 0, 1, 50, 1);
+    voice(0).active = 0;
+    player.cursor.poscurv = 0;
     player.audition_track(1, 1);
     calls(1);
     EXPECT_EQ(voice(1).active, 1);
@@ -265,26 +227,27 @@ TEST_F(Transport, MetersRiseOnNotesAndFallOneACall) {
     EXPECT_EQ(tr.valvu[1].load(), 0.0f);
 }
 
-TEST_F(Transport, EditCursorJumpsWrapToTheNextPosition) {
-    make_song(1, {0, 1}, {8, 8});
+TEST_F(Transport, EditCursorAndColumns) {
+    make_song(1, {0, 1, 1}, {8, 20});
+    EXPECT_EQ(player.dopatend(), 48);
+    EXPECT_EQ(tr.patend, 3);
     player.cursor.poscurv = 6;
-    player.jump(4, false);
+    player.jump(4, false);  // wraps into the next position
     EXPECT_EQ(player.cursor.poscurv, 2);
     EXPECT_EQ(tr.nopat, 1);
-    player.cursor.poscurv = 7;
-    player.jump(1, true);
-    EXPECT_EQ(player.cursor.poscurv, 0);
-    EXPECT_EQ(tr.nopat, 1);
-    player.jump(1, false, true);  // Control: next position only, 0 after the last
+    player.jump(1, false, true);  // Control: the next position only
+    EXPECT_EQ(tr.nopat, 2);
+    player.jump(1, false, true);  // 0 after the last
     EXPECT_EQ(tr.nopat, 0);
+    player.cursor.poscurv = 7;
+    player.jump(1, true);  // stays on its position
     EXPECT_EQ(player.cursor.poscurv, 0);
+    EXPECT_EQ(tr.nopat, 0);
     EXPECT_EQ(std::count_if(player.window_posts.begin(), player.window_posts.end(),
                             [](const Message& m) { return m.code == kMsgDoup; }),
-              2);
-}
+              3);
 
-TEST_F(Transport, ColumnMappingSkipsHiddenTracksAndNextCellSearch) {
-    player.cursor.fshadow[1] = 1;
+    player.cursor.fshadow[1] = 1;  // hidden track
     EXPECT_EQ(player.fan(0), 0);
     EXPECT_EQ(player.fan(1), 2);
     EXPECT_EQ(player.fun(2), 1);
@@ -294,12 +257,6 @@ TEST_F(Transport, ColumnMappingSkipsHiddenTracksAndNextCellSearch) {
     EXPECT_EQ(Player::prochain(column, 0, 8), 5);
     EXPECT_EQ(Player::prochain(column, 5, 8), 5);
     EXPECT_EQ(Player::prochain(column, 6, 8), 8);
-}
-
-TEST_F(Transport, SongRowsAreSummedOverTheSequence) {
-    make_song(1, {0, 1, 1}, {10, 20});
-    EXPECT_EQ(player.dopatend(), 50);
-    EXPECT_EQ(tr.patend, 3);
 }
 
 }  // namespace

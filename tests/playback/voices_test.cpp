@@ -1,5 +1,3 @@
-#include <cmath>
-
 #include "song_fixture.h"
 
 namespace ondrel {
@@ -53,15 +51,20 @@ TEST_F(Voices, PeriodTableAndFinetune) {
     const auto& t = floatnote();
     EXPECT_EQ(t[0], 6848.0f);
     EXPECT_EQ(t[60], 214.0f);
-    EXPECT_FLOAT_EQ(t[12], static_cast<float>(6848.0 * std::pow(0.943874312, 12)));
-    EXPECT_NEAR(t[12], 3424.0f, 0.01f);  // an octave is half the period
+    EXPECT_NEAR(t[12], 3424.0f, 0.01f);  // an octave halves the period
+    EXPECT_NEAR(t[48], 428.0f, 0.01f);   // the MOD table's C-3
     for (int i = 1; i < 128; ++i) EXPECT_LT(t[i], t[i - 1]) << i;
     EXPECT_EQ(finetune_factor(0), 1.0f);
     EXPECT_EQ(finetune_factor(15), 1.0f);
-    EXPECT_FLOAT_EQ(finetune_factor(8), static_cast<float>(1 + 7 * 0.059463094 / 8));
-    EXPECT_FLOAT_EQ(finetune_factor(7), static_cast<float>(1 - 7 * 0.056125688 / 8));
-    EXPECT_FLOAT_EQ(finetune_factor(14), static_cast<float>(1 + 0.059463094 / 8));
     EXPECT_EQ(finetune_factor(-1), finetune_factor(15));
+    // 1 to 7 sharpen by up to 7/8 semitone; 8 to 14 flatten by 7/8 down to 1/8.
+    const float semitone = 1.059463094f;
+    EXPECT_LT(finetune_factor(1), 1.0f);
+    EXPECT_GT(finetune_factor(7), 1 / semitone);
+    EXPECT_LT(finetune_factor(7), finetune_factor(1));
+    EXPECT_GT(finetune_factor(8), finetune_factor(14));
+    EXPECT_GT(finetune_factor(14), 1.0f);
+    EXPECT_LT(finetune_factor(8), semitone);
 }
 
 class Envelopes : public test::SongFixture {
@@ -79,38 +82,36 @@ protected:
 
 TEST_F(Envelopes, SegmentsAreLaidOverTheSampleLength) {
     set(0, {0, 64, 128, 192, 255}, {0, 128, 64, 64, 32});
-    EXPECT_EQ(at(0, 0, 1000), 0.0f);
-    EXPECT_EQ(at(0, 500, 1000), 65 / 128.0f);  // x 127, between 128 at x 64 and 64 at x 128
-    EXPECT_EQ(at(0, 251, 1000), 1.0f);         // x 64: the start of the second segment
-    EXPECT_EQ(at(0, 100, 1000), 50 / 128.0f);  // x 25 on the rising first segment
-    EXPECT_EQ(at(0, 999, 1000), 33 / 128.0f);  // x 254: last segment, not yet 0
-    EXPECT_EQ(at(0, 1000, 1000), 0.0f);        // x 255 = x4: zero only at the very end
-    EXPECT_EQ(at(0, 5000, 1000), 0.0f);
-}
-
-TEST_F(Envelopes, AnEndPointAtTheMiddleSilencesTheSecondHalf) {
-    set(0, {0, 32, 64, 96, 128}, {128, 128, 128, 128, 128});
-    EXPECT_EQ(at(0, 499, 1000), 1.0f);
-    EXPECT_EQ(at(0, 503, 1000), 0.0f);
-}
-
-TEST_F(Envelopes, ZeroLengthReadsTheFirstLevelAndKindsScale) {
     set(1, {0, 64, 128, 192, 255}, {100, 100, 100, 100, 100});
     set(2, {0, 64, 128, 192, 255}, {200, 200, 200, 200, 200});
     set(3, {0, 64, 128, 192, 255}, {70, 70, 70, 70, 70});
-    EXPECT_EQ(at(1, 123, 0), 200.0f);  // level x 2
-    EXPECT_EQ(at(2, 0, 0), 127.0f);    // pan, not above 127
-    EXPECT_EQ(at(3, 0, 0), 70.0f);
-}
-
-TEST_F(Envelopes, FadeRunsOnTheMixerCounterAndKind16AtAFixedPlace) {
     set(4, {0, 64, 128, 192, 255}, {128, 96, 64, 32, 0});
-    voice(9).position = 0;
-    voice(9).count1 = 100;  // x = 100 * 255 / 200 = 127
-    EXPECT_EQ(player.compute_adsr(4, 9, 200, env.get()), 65 / 128.0f);
-    set(0, {0, 64, 128, 192, 255}, {0, 0, 0, 128, 128});
-    EXPECT_EQ(player.compute_adsr(16, 9, 255, env.get()), 1.0f);  // x 192
-    EXPECT_EQ(player.compute_adsr(0, 9, 255, env.get()), 0.0f);
+    struct Case {
+        int kind;
+        uint32_t position;
+        unsigned long length;
+        float want;
+    };
+    const Case cases[] = {
+        {0, 0, 1000, 0.0f},
+        {0, 100, 1000, 50 / 128.0f},  // x 25 on the rising first segment
+        {0, 251, 1000, 1.0f},         // x 64: the start of the second segment
+        {0, 500, 1000, 65 / 128.0f},  // x 127, between 128 at x 64 and 64 at x 128
+        {0, 999, 1000, 33 / 128.0f},  // x 254: the last segment, not yet 0
+        {0, 1000, 1000, 0.0f},        // x 255 = the last point: zero only at the very end
+        {0, 5000, 1000, 0.0f},
+        {1, 123, 0, 200.0f},         // send: the level doubled
+        {2, 0, 0, 127.0f},           // pan, not above 127
+        {3, 0, 0, 70.0f},            // pitch: the level itself
+        {4, 100, 200, 65 / 128.0f},  // fade, on the mixer's counter: x = 100 x 255 / 200 = 127
+    };
+    for (const Case& c : cases)
+        EXPECT_EQ(at(c.kind, c.position, c.length), c.want) << "kind " << c.kind << " at " << c.position;
+    set(0, {0, 32, 64, 96, 128}, {128, 128, 128, 128, 128});  // an end point at the middle
+    EXPECT_EQ(at(0, 499, 1000), 1.0f);
+    EXPECT_EQ(at(0, 503, 1000), 0.0f);
+    set(0, {0, 64, 128, 192, 255}, {0, 0, 0, 128, 128});  // kind 16 reads envelope 0 at x 192
+    EXPECT_EQ(player.compute_adsr(16, 9, 255, env.get()), 1.0f);
 }
 
 }  // namespace

@@ -64,13 +64,17 @@ TEST_F(NoAllocation, BufferProcAllocatesNothingWhilePlaying) {
     a.loopend = 5000;
     a.flagword = 31;
     a.flag2 = 1;
-    sample16(2, std::vector<int16_t>(3000, 1000), true);
-    sample16(3, std::vector<int16_t>(3000, -700));
+    sample<int16_t>(2, std::vector<int16_t>(3000, 1000), true);
+    sample<int16_t>(3, std::vector<int16_t>(3000, -700));
     Pattern* p = engine.bank.song_pattern(0);
     for (int r = 0; r < 64; r += 2)
         for (int t = 0; t < kTracksUsed; ++t)
-            p->col[t][r] = {static_cast<uint8_t>(40 + t), 0, 0, static_cast<uint8_t>(1 + t % 3),
-                            static_cast<uint8_t>(t == 11 ? 33 : (t % 2 ? 4 : 10)), static_cast<uint8_t>(t == 11 ? 12 : 0x21)};
+            p->col[t][r] = {static_cast<uint8_t>(40 + t),
+                            0,
+                            0,
+                            static_cast<uint8_t>(1 + t % 3),
+                            static_cast<uint8_t>(t == 11 ? 33 : (t % 2 ? 4 : 10)),
+                            static_cast<uint8_t>(t == 11 ? 12 : 0x21)};
     p->col[11][1] = {0x80, 0, 0, 0, 10, 0x02};
     player.start(false);
     std::vector<float> out(2 * 1024);

@@ -5,87 +5,64 @@
 namespace ondrel {
 namespace {
 
-TEST(SongBank, StartsWithOneSongAndItsFirstPattern) {
-    SongBank bank;
-    ASSERT_EQ(bank.nbimod, 1);
-    EXPECT_EQ(bank.current().patmark[127][7].position, kEmptyMark);
-    EXPECT_EQ(bank.current().efxval[64], 0u);  // only the first 64 slots default to 1000 Hz
-    ASSERT_NE(bank.song_pattern(0), nullptr);
-    EXPECT_EQ(bank.song_pattern(0)->allocated_tracks(), 8);
-    EXPECT_EQ(bank.nbvoie, 8);
-}
-
-TEST(SongBank, SixtyFourthSongIsRefusedWithTheAlert) {
+TEST(SongBank, SongsAreAddedUpToSixtyThreeAndKeepEachOthersData) {
     AlertLog alerts;
     SongBank bank(&alerts);
+    EXPECT_EQ(bank.song_pattern(0)->allocated_tracks(), 8);
+    EXPECT_EQ(bank.nbvoie, 8);
+    EXPECT_EQ(bank.current().patmark[127][7].position, kEmptyMark);
+    EXPECT_EQ(bank.current().efxval[64], 0u);  // only the first 64 slots default to 1000 Hz
+    Pattern* first = bank.song_pattern(0);
+    bank.t_sound[3] = make_sample(10);
+    p_s* sample = bank.t_sound[3].get();
     for (int i = 1; i < kSongsUsable; ++i) ASSERT_TRUE(bank.newmusic()) << i;
     EXPECT_EQ(bank.nbimod, 63);
     EXPECT_EQ(bank.noimod, 62);
     EXPECT_EQ(bank.current().patbase, 62 * 128);
     EXPECT_EQ(bank.p_pat.size(), 63u * 128);
+    EXPECT_EQ(bank.pattern(0), first);
+    EXPECT_EQ(bank.sample(3), sample);
+    EXPECT_EQ(bank.sample(128 + 3), nullptr);
+    EXPECT_TRUE(alerts.shown.empty());
 
     EXPECT_FALSE(bank.newmusic());
     EXPECT_EQ(bank.nbimod, 63);
     ASSERT_EQ(alerts.shown.size(), 1u);
     EXPECT_EQ(alerts.shown[0].text, "Can't create new music");
-    ASSERT_EQ(alerts.shown[0].buttons.size(), 1u);
-    EXPECT_EQ(alerts.shown[0].buttons[0], "My god...");
+    EXPECT_EQ(alerts.shown[0].buttons, std::vector<std::string>{"My god..."});
 }
 
-TEST(SongBank, AddingSongsKeepsEarlierPatternsAndSamples) {
-    SongBank bank;
-    Pattern* first = bank.song_pattern(0);
-    bank.t_sound[3] = make_sample(10);
-    p_s* sample = bank.t_sound[3].get();
-    ASSERT_TRUE(bank.newmusic());
-    EXPECT_EQ(bank.pattern(0), first);
-    EXPECT_EQ(bank.sample(3), sample);
-    EXPECT_EQ(bank.pattern(128), nullptr);
-    EXPECT_EQ(bank.sample(128 + 3), nullptr);
-}
-
-TEST(SongBank, PatternCreationAndRelease) {
+TEST(SongBank, PatternsAreCreatedWidenedAndFreed) {
     SongBank bank;
     bank.current().rows[5] = 17;
     bank.patcreate(5, 3);
     Pattern* p = bank.pattern(5);
     ASSERT_NE(p, nullptr);
     EXPECT_EQ(p->allocated_tracks(), 3);
-    EXPECT_EQ(p->column(3), nullptr);
     for (int r = 0; r < 17; ++r) EXPECT_TRUE(p->column(2)[r].empty());
-
-    p->col[0][4].note = 50;
+    p->col[1][16].note = 50;
     bank.patcreate(5, 10);  // exists: nothing changes
     EXPECT_EQ(bank.pattern(5), p);
     EXPECT_EQ(p->allocated_tracks(), 3);
-    EXPECT_EQ(p->col[0][4].note, 50);
+
+    bank.updatenbvoice(12);  // every pattern gets the missing columns
+    EXPECT_EQ(bank.nbvoie, 12);
+    EXPECT_EQ(bank.pattern(0)->allocated_tracks(), 12);
+    EXPECT_EQ(p->allocated_tracks(), 12);
+    EXPECT_EQ(p->col[1][16].note, 50);
+    EXPECT_TRUE(p->column(11)[16].empty());
+    bank.updatenbvoice(4);  // narrower: nothing freed
+    EXPECT_EQ(p->allocated_tracks(), 12);
 
     bank.Gofree(5);
     EXPECT_EQ(bank.pattern(5), nullptr);
     bank.Gofree(5000);  // out of the table: ignored
 }
 
-TEST(SongBank, WideningAddsMissingColumnsToEveryPattern) {
-    SongBank bank;
-    bank.current().rows[2] = 32;
-    bank.patcreate(2, 2);
-    bank.pattern(2)->col[1][31].command = 7;
-    bank.updatenbvoice(12);
-    EXPECT_EQ(bank.nbvoie, 12);
-    EXPECT_EQ(bank.pattern(0)->allocated_tracks(), 12);
-    EXPECT_EQ(bank.pattern(2)->allocated_tracks(), 12);
-    EXPECT_EQ(bank.pattern(2)->col[1][31].command, 7);
-    EXPECT_TRUE(bank.pattern(2)->column(11)[31].empty());
-    bank.updatenbvoice(4);  // narrower: nothing freed
-    EXPECT_EQ(bank.nbvoie, 12);
-    EXPECT_EQ(bank.pattern(2)->allocated_tracks(), 12);
-}
-
 TEST(SongBank, KillingASongShiftsTheLaterOnesDown) {
     SongBank bank;
     ASSERT_TRUE(bank.newmusic());
     ASSERT_TRUE(bank.newmusic());
-    set_text(bank.timod[1]->name, "middle");
     set_text(bank.timod[2]->name, "last");
     bank.patcreate(2 * 128 + 4, 1);
     Pattern* last_pattern = bank.pattern(2 * 128 + 4);
@@ -98,7 +75,6 @@ TEST(SongBank, KillingASongShiftsTheLaterOnesDown) {
     EXPECT_EQ(bank.current().sndbase, 128);
     EXPECT_EQ(bank.pattern(128 + 4), last_pattern);
     EXPECT_EQ(bank.p_pat.size(), 256u);
-
     bank.killmusic();
     bank.killmusic();  // the last song is replaced by an empty one
     EXPECT_EQ(bank.nbimod, 1);
@@ -106,35 +82,26 @@ TEST(SongBank, KillingASongShiftsTheLaterOnesDown) {
     EXPECT_NE(bank.song_pattern(0), nullptr);
 }
 
-TEST(SampleRecord, ResetValuesAndSlack) {
+TEST(SampleRecord, ResetValuesSlackAndBounds) {
     SampleRef s = make_sample(100);
-    ASSERT_NE(s->data, nullptr);
     EXPECT_EQ(s->data, reinterpret_cast<uint8_t*>(s.get()) + sizeof(p_s));
-    EXPECT_EQ(s->length, 100u);
     for (size_t i = 0; i < 100 + kSampleSlack; ++i) ASSERT_EQ(s->data[i], 0) << i;
     EXPECT_EQ(s->refnote, 72);
     EXPECT_EQ(s->level, 64);
     EXPECT_EQ(s->setting, 102400u);
     EXPECT_EQ(s->range2[1], 127);
-    // Point 2 of envelope 0 is flat at 128 at x 128; envelope 4 falls to 0 at x 255.
+    // Envelope 0 is flat at 128, envelope 4 falls from 128 to 0 at x 255.
     EXPECT_EQ(s->env(0, 2), 128 << 8 | 128);
     EXPECT_EQ(s->env(2, 1), 64 << 8 | 64);
     EXPECT_EQ(s->env(4, 1), 64 << 8 | 96);
     EXPECT_EQ(s->env(4, 4), 255 << 8 | 0);
-    // Raz_data keeps data, length and volume.
     s->volume = 90;
     s->rate = 22050;
-    s->flagword = 3;
-    Raz_data(*s);
+    Raz_data(*s);  // keeps data, length and volume
     EXPECT_EQ(s->volume, 90);
     EXPECT_EQ(s->rate, 0u);
-    EXPECT_EQ(s->flagword, 0);
     EXPECT_EQ(s->length, 100u);
-    EXPECT_NE(s->data, nullptr);
-}
 
-TEST(SampleRecord, BoundingKeepsLoopsInsideTheData) {
-    SampleRef s = make_sample(1000);
     s->bits = 16;
     s->stereo = 1;
     s->refnote = 300;
@@ -143,10 +110,9 @@ TEST(SampleRecord, BoundingKeepsLoopsInsideTheData) {
     bound_sample(*s);
     EXPECT_EQ(s->framecode, 2);
     EXPECT_EQ(s->refnote, 127);
-    EXPECT_EQ(s->loopend, 1000u);
-    EXPECT_EQ(s->loopstart, 1000u);
+    EXPECT_EQ(s->loopend, 100u);
+    EXPECT_EQ(s->loopstart, 100u);
     s->bits = 12;
-    s->stereo = 1;
     bound_sample(*s);
     EXPECT_EQ(s->bits, 8);
     EXPECT_EQ(s->framecode, 1);  // 8-bit stereo: two bytes a frame
@@ -160,20 +126,24 @@ TEST(Record, BoundingClampsIndicesFromFiles) {
     m.nbvoice[5] = 0;
     m.nbvoice[6] = 500;
     m.efxb[7] = 400;
+    m.efxa[8] = -3;
     m.rows[8] = 0;
     m.rows[9] = 30000;
     m.tempo = 0;
     m.nbtrack = 0;
+    m.mode = 7;
     bound_record(m);
     EXPECT_EQ(m.trackvol[3], 127);
     EXPECT_EQ(m.tracke[4], 0);
     EXPECT_EQ(m.nbvoice[5], 1);
     EXPECT_EQ(m.nbvoice[6], 127);
     EXPECT_EQ(m.efxb[7], 255);
+    EXPECT_EQ(m.efxa[8], 0);
     EXPECT_EQ(m.rows[8], 1);
     EXPECT_EQ(m.rows[9], kMaxRows);
     EXPECT_EQ(m.tempo, 480000u);
     EXPECT_EQ(m.nbtrack, 1);
+    EXPECT_EQ(m.mode, 2);
 }
 
 }  // namespace
