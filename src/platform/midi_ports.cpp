@@ -1,0 +1,187 @@
+#include "platform/midi_ports.h"
+
+#include <rtmidi/RtMidi.h>
+
+#include <chrono>
+#include <cstdlib>
+#include <cstring>
+
+namespace ondrel {
+
+namespace {
+
+RtMidi::Api chosen_api() {
+    const char* api = std::getenv("ONDREL_MIDI_API");
+    return api && std::strcmp(api, "jack") == 0 ? RtMidi::UNIX_JACK : RtMidi::LINUX_ALSA;
+}
+
+// RtMidi reports warnings on standard error unless someone listens; the ports' users are
+// told through return values instead.
+void ignore_error(RtMidiError::Type, const std::string&, void*) {}
+
+template <class Port>
+std::vector<std::string> names_of(Port* port) {
+    std::vector<std::string> names;
+    if (!port) return names;
+    const unsigned count = port->getPortCount();
+    for (unsigned i = 0; i < count; ++i) names.push_back(port->getPortName(i));
+    return names;
+}
+
+template <class Port>
+int index_of(Port* port, const std::string& name) {
+    const auto names = names_of(port);
+    for (size_t i = 0; i < names.size(); ++i)
+        if (names[i] == name) return static_cast<int>(i);
+    return -1;
+}
+
+}  // namespace
+
+MidiPorts::MidiPorts(MidiRouter& router) : router_(router) {
+    const RtMidi::Api api = chosen_api();
+    api_ = api;
+    try {
+        probe_in_ = std::make_unique<RtMidiIn>(api, "Ondrel Tracker");
+        probe_out_ = std::make_unique<RtMidiOut>(api, "Ondrel Tracker");
+        probe_in_->setErrorCallback(ignore_error);
+        probe_out_->setErrorCallback(ignore_error);
+        available_ = true;
+    } catch (const RtMidiError& e) {
+        why_ = api == RtMidi::UNIX_JACK ? "no JACK server" : "no ALSA sequencer";
+        why_ += " (" + e.getMessage() + ")";
+        probe_in_.reset();
+        probe_out_.reset();
+    }
+}
+
+MidiPorts::~MidiPorts() {
+    close_input();
+    close_output();
+}
+
+std::vector<std::string> MidiPorts::output_names() const {
+    return names_of(probe_out_.get());
+}
+
+std::vector<std::string> MidiPorts::input_names() const {
+    return names_of(probe_in_.get());
+}
+
+bool MidiPorts::open_output(const std::string& name, std::string& why) {
+    close_output();
+    if (!available_) {
+        why = why_;
+        return false;
+    }
+    const int index = index_of(probe_out_.get(), name);
+    if (index < 0) {
+        why = "no MIDI output port \"" + name + "\"";
+        return false;
+    }
+    try {
+        auto out = std::make_unique<RtMidiOut>(static_cast<RtMidi::Api>(api_), "Ondrel Tracker output");
+        out->setErrorCallback(ignore_error);
+        out->openPort(static_cast<unsigned>(index), "Ondrel Tracker");
+        if (!out->isPortOpen()) {
+            why = "cannot open the MIDI output port \"" + name + "\"";
+            return false;
+        }
+        out_ = std::move(out);
+    } catch (const RtMidiError& e) {
+        why = "cannot open the MIDI output port \"" + name + "\": " + e.getMessage();
+        return false;
+    }
+    output_name_ = name;
+    MidiEvent stale;
+    while (out_queue_.pop(stale)) {
+    }
+    sending_ = true;
+    sender_ = std::thread([this] { send_loop(); });
+    router_.attach(MidiRouter::Port, &out_queue_);
+    return true;
+}
+
+void MidiPorts::close_output() {
+    router_.attach(MidiRouter::Port, nullptr);
+    sending_ = false;
+    if (sender_.joinable()) sender_.join();
+    out_.reset();
+    output_name_.clear();
+}
+
+void MidiPorts::send_loop() {
+    using namespace std::chrono;
+    auto next_check = steady_clock::now();
+    std::vector<unsigned char> bytes;
+    while (sending_.load()) {
+        MidiEvent e;
+        while (out_queue_.pop(e)) {
+            bytes.assign(e.bytes.begin(), e.bytes.begin() + e.size);
+            out_->sendMessage(&bytes);
+        }
+        // A port that went away (a device unplugged, a program closed) stops the sending.
+        if (steady_clock::now() >= next_check) {
+            next_check = steady_clock::now() + milliseconds(500);
+            if (index_of(out_.get(), output_name_) < 0) {
+                router_.attach(MidiRouter::Port, nullptr);
+                if (lost_) lost_(output_name_);
+                return;
+            }
+        }
+        std::this_thread::sleep_for(milliseconds(1));
+    }
+}
+
+bool MidiPorts::open_input(const std::string& name, NoteHandler on_note, std::string& why) {
+    close_input();
+    if (!available_) {
+        why = why_;
+        return false;
+    }
+    const int index = index_of(probe_in_.get(), name);
+    if (index < 0) {
+        why = "no MIDI input port \"" + name + "\"";
+        return false;
+    }
+    try {
+        auto in = std::make_unique<RtMidiIn>(static_cast<RtMidi::Api>(api_), "Ondrel Tracker input");
+        in->setErrorCallback(ignore_error);
+        in->ignoreTypes(true, true, true);
+        on_note_ = std::move(on_note);
+        parser_ = MidiInputParser();
+        in->setCallback(&MidiPorts::input_callback, this);
+        in->openPort(static_cast<unsigned>(index), "Ondrel Tracker");
+        if (!in->isPortOpen()) {
+            why = "cannot open the MIDI input port \"" + name + "\"";
+            return false;
+        }
+        in_ = std::move(in);
+    } catch (const RtMidiError& e) {
+        why = "cannot open the MIDI input port \"" + name + "\": " + e.getMessage();
+        return false;
+    }
+    input_name_ = name;
+    return true;
+}
+
+void MidiPorts::close_input() {
+    if (in_) {
+        in_->closePort();
+        in_->cancelCallback();
+    }
+    in_.reset();
+    input_name_.clear();
+}
+
+void MidiPorts::input_callback(double, std::vector<unsigned char>* message, void* self) {
+    auto* ports = static_cast<MidiPorts*>(self);
+    if (!message) return;
+    ports->parser_.feed(message->data(), message->size(), [ports](const MidiEvent& m) {
+        // What comes in goes out again, as a keyboard played through the program.
+        ports->router_.send(m);
+        if (MidiInputParser::is_note_played(m) && ports->on_note_) ports->on_note_(m.bytes[1], m.bytes[2]);
+    });
+}
+
+}  // namespace ondrel
