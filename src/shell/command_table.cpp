@@ -1,6 +1,7 @@
 #include "shell/command_table.h"
 
 #include <array>
+#include <string>
 
 #include "shell/command_handlers.h"
 #include "shell/program.h"
@@ -288,6 +289,15 @@ const CommandInfo* command_for_shortcut(const KeyChord& chord) {
     for (const CommandInfo& c : kCommands)
         if (c.shortcut == chord) return &c;
     return nullptr;
+}
+
+void run_command(Program& p, const CommandInfo& command, const ShellMessage& message) {
+    if (!command.handler) {
+        p.say(std::string("\"") + command.label + "\" is not available in this build");
+        return;
+    }
+    if (command.enabled && !command.enabled(p)) return;
+    command.handler(p, message);
 }
 
 const char* menu_title(Menu menu) {

@@ -48,6 +48,9 @@ std::span<const CommandInfo> command_table();
 const CommandInfo* find_command(uint32_t code);
 // The entry whose shortcut is chord, or null.
 const CommandInfo* command_for_shortcut(const KeyChord& chord);
+// Runs command's handler when it can be chosen; one without a handler says so in the
+// status line rather than doing nothing unseen.
+void run_command(Program& p, const CommandInfo& command, const ShellMessage& message);
 const char* menu_title(Menu menu);
 
 inline constexpr uint32_t kMaxSongMenuItems = 63;

@@ -48,12 +48,7 @@ void Program::handle(const ShellMessage& message) {
         std::printf("unknown command '%s'\n", code_text(message.code).c_str());
         return;
     }
-    if (!command->handler) {
-        say(std::string("\"") + command->label + "\" is not available in this build");
-        return;
-    }
-    if (command->enabled && !command->enabled(*this)) return;
-    command->handler(*this, message);
+    run_command(*this, *command, message);
 }
 
 void Program::key_down(const KeyChord& chord, bool repeat) {

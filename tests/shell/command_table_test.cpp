@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include "shell/program.h"
+
 namespace ondrel {
 namespace {
 
@@ -129,6 +131,43 @@ TEST(CommandTable, ShortcutsAreUniqueAndFindTheirCommand) {
         if (c.shortcut.empty()) continue;
         SCOPED_TRACE(c.label);
         EXPECT_EQ(command_for_shortcut(c.shortcut), &c);
+    }
+}
+
+TEST(CommandTable, EveryCommandReachesAHandler) {
+    for (const CommandInfo& c : command_table()) {
+        SCOPED_TRACE(c.label);
+        EXPECT_NE(c.handler, nullptr);
+    }
+}
+
+int handled = 0;
+void count_handled(Program&, const ShellMessage&) {
+    ++handled;
+}
+
+TEST(CommandTable, ACommandRunsOnlyWhenItCanAndOneWithoutAHandlerSaysSo) {
+    struct Case {
+        CommandHandler handler;
+        CommandTest enabled;
+        int runs;
+        const char* said;
+    };
+    const Case cases[] = {
+        {count_handled, nullptr, 1, ""},
+        {count_handled, [](const Program&) { return true; }, 1, ""},
+        {count_handled, [](const Program&) { return false; }, 0, ""},
+        {nullptr, nullptr, 0, "\"Try me\" is not available in this build"},
+        {nullptr, [](const Program&) { return true; }, 0, "\"Try me\" is not available in this build"},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.said);
+        Program p;
+        handled = 0;
+        const CommandInfo command{code_of("tRYm"), "Try me", Menu::None, nullptr, {}, c.handler, c.enabled};
+        run_command(p, command, ShellMessage(command.code));
+        EXPECT_EQ(handled, c.runs);
+        EXPECT_EQ(p.last_said(), c.said);
     }
 }
 
