@@ -124,7 +124,8 @@ const CommandInfo kCommands[] = {
     // Options
     {fourcc("GOte"), "Tempo", Menu::Options, nullptr, kNoKey, cmd_tempo_option, nullptr,
      [](const Program& p) { return p.engine.mixer.ftemp != 0; }},
-    {fourcc("Mfil"), "File Mode", Menu::Options, "Play Mode", kNoKey, cmd_pan_mode},
+    {fourcc("Mfil"), "File Mode", Menu::Options, "Play Mode", kNoKey, cmd_pan_mode, nullptr,
+     [](const Program& p) { return p.engine.bank.current().mode == p.engine.bank.current().format; }},
     {fourcc("Mami"), "Amiga Mode", Menu::Options, "Play Mode", kNoKey, cmd_pan_mode, nullptr,
      [](const Program& p) { return p.engine.bank.current().mode == 1; }},
     {fourcc("Mler"), "L&R Mode", Menu::Options, "Play Mode", kNoKey, cmd_pan_mode, nullptr,

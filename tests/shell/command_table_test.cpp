@@ -1,5 +1,5 @@
 // The menu commands: each code with its exact label and shortcut, in menu order, and each
-// reaching a handler.
+// reaching a handler; the check marks of the pan modes.
 #include "shell/command_table.h"
 
 #include <gtest/gtest.h>
@@ -168,6 +168,32 @@ TEST(CommandTable, ACommandRunsOnlyWhenItCanAndOneWithoutAHandlerSaysSo) {
         run_command(p, command, ShellMessage(command.code));
         EXPECT_EQ(handled, c.runs);
         EXPECT_EQ(p.last_said(), c.said);
+    }
+}
+
+TEST(CommandTable, OnePanModeShowsItsMarkAndFileModeWhenTheModeIsTheFilesOwn) {
+    struct Case {
+        int16_t format;  // 1 MOD, 2 S3M, 0 a new song
+        const char* chosen;
+        const char* marked;  // the pan modes with a check mark, in menu order
+    };
+    const Case cases[] = {
+        {1, "Mfil", "Mfil Mami "}, {2, "Mfil", "Mfil Mpan "}, {0, "Mfil", "Mfil "},
+        {1, "Mpan", "Mpan "},      {2, "Mler", "Mler "},      {2, "Mami", "Mami "},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(std::string(c.chosen) + " of format " + std::to_string(c.format));
+        Program p;
+        p.engine.bank.current().format = c.format;
+        p.post(code_of(c.chosen));
+        p.run_pending();
+        std::string marked;
+        for (const char* mode : {"Mfil", "Mami", "Mler", "Mpan"}) {
+            const CommandInfo* command = find_command(code_of(mode));
+            ASSERT_NE(command->checked, nullptr);
+            if (command->checked(p)) marked += std::string(mode) + " ";
+        }
+        EXPECT_EQ(marked, c.marked);
     }
 }
 
