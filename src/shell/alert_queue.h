@@ -6,6 +6,11 @@
 
 namespace ondrel {
 
+// The button a key chooses: Escape takes "Cancel" where there is one, else the first;
+// Enter takes the alert's default.
+int escape_button(const Alert& alert);
+int enter_button(const Alert& alert);
+
 // The alerts waiting for the user, drawn one at a time as modal popups. The engine raises
 // its alerts synchronously (AlertSink::show): they only inform, so they are queued and the
 // first button is taken. Questions from the program's own commands carry what to do with

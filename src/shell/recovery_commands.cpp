@@ -19,7 +19,8 @@ void offer_copy(Program& p, std::shared_ptr<std::vector<RecoveryCopy>> copies, s
     const Alert question{
         "Recovery",
         "The program was ended with unsaved changes to " + song_label(copy) + ". Reopen them?",
-        {"Reopen", "Discard"}};
+        {"Reopen", "Discard"},
+        0};  // Enter keeps the copy: discarding it cannot be undone
     p.alerts.ask(question, [&p, copies, i, copy](int button) {
         if (button == 0) {
             SongBank& bank = p.engine.bank;

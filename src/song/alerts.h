@@ -9,6 +9,7 @@ struct Alert {
     std::string title;
     std::string text;
     std::vector<std::string> buttons;
+    int default_button = -1;  // what Enter chooses; -1: the last button
 };
 
 class AlertSink {

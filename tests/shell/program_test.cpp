@@ -180,5 +180,27 @@ TEST_F(ProgramTest, OptionTogglesShowTheirState) {
     EXPECT_EQ(p.editor.layout, KeyboardLayout::Atari);
 }
 
+TEST(AlertKeys, EnterNeverTakesADestructiveChoiceAndEscapeTakesCancelOrTheFirst) {
+    struct Case {
+        std::vector<std::string> buttons;
+        int default_button;
+        int enter, escape;
+    };
+    const Case cases[] = {
+        {{"Save", "Don't Save", "Cancel"}, -1, 2, 2},
+        {{"Yes", "No !!"}, -1, 1, 0},  // the synthesiser's questions: Escape says yes
+        {{"Reopen", "Discard"}, 0, 0, 0},
+        {{"oops !!"}, -1, 0, 0},
+        {{}, -1, 0, 0},
+        {{"One", "Two"}, 2, 1, 0},  // a default that is no button: the last
+    };
+    for (const Case& c : cases) {
+        const Alert alert{"title", "text", c.buttons, c.default_button};
+        SCOPED_TRACE(c.buttons.empty() ? "no buttons" : c.buttons.front());
+        EXPECT_EQ(enter_button(alert), c.enter);
+        EXPECT_EQ(escape_button(alert), c.escape);
+    }
+}
+
 }  // namespace
 }  // namespace ondrel

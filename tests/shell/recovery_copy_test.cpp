@@ -75,7 +75,7 @@ TEST(RecoveryCopy, ProgramKeepsUnsavedSongsAndOffersThemBack) {
     offer_recovery_copies(next);
     ASSERT_NE(next.alerts.front(), nullptr);
     EXPECT_EQ(next.alerts.front()->buttons, (std::vector<std::string>{"Reopen", "Discard"}));
-    next.alerts.answer(0);
+    next.alerts.answer(enter_button(*next.alerts.front()));  // Enter keeps the copy
     EXPECT_STREQ(next.engine.bank.current().name, "second");
     EXPECT_EQ(next.engine.bank.pattern(next.engine.bank.current().patbase)->column(0)[0].note, 49);
     EXPECT_TRUE(next.history().dirty());

@@ -6,16 +6,6 @@
 
 namespace ondrel {
 
-namespace {
-// Escape takes "Cancel" where there is one, else the first button; Enter takes the last,
-// the button an alert offers as its default.
-int escape_button(const Alert& alert) {
-    for (size_t i = 0; i < alert.buttons.size(); ++i)
-        if (alert.buttons[i] == "Cancel") return static_cast<int>(i);
-    return 0;
-}
-}  // namespace
-
 void draw_alerts(Program& p) {
     const Alert* alert = p.alerts.front();
     if (!alert) return;
@@ -42,8 +32,7 @@ void draw_alerts(Program& p) {
     if (count == 0 && ImGui::Button("OK", ImVec2(110, 0))) chosen = 0;
     if (chosen < 0 && ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Escape)))
         chosen = escape_button(*alert);
-    if (chosen < 0 && ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Enter)))
-        chosen = count > 0 ? count - 1 : 0;
+    if (chosen < 0 && ImGui::IsKeyPressed(ImGui::GetKeyIndex(ImGuiKey_Enter))) chosen = enter_button(*alert);
     if (chosen >= 0) {
         ImGui::CloseCurrentPopup();
         ImGui::EndPopup();
