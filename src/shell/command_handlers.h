@@ -133,6 +133,8 @@ void cmd_analyser(Program& p, const ShellMessage& m);
 // Searches.
 void cmd_find_next(Program& p, const ShellMessage& m);
 void cmd_replace_all(Program& p, const ShellMessage& m);
+// Replaces the hit under the cursor, if it is on one, then finds the next.
+void cmd_replace_one(Program& p, const ShellMessage& m);
 void cmd_find_unused_instruments(Program& p, const ShellMessage& m);
 void cmd_find_current_instrument(Program& p, const ShellMessage& m);
 

@@ -69,6 +69,7 @@ const CommandInfo kCommands[] = {
     {fourcc("Srch"), "Find and Replace...", Menu::Edit, nullptr, ctrl('f'), cmd_open_window},
     {fourcc("Sfnd"), "Find Next", Menu::Edit, nullptr, plain(kKeyF1 + 2), cmd_find_next},
     {fourcc("Srpl"), "Replace All", Menu::Edit, nullptr, kNoKey, cmd_replace_all},
+    {fourcc("Srp1"), "Replace", Menu::None, nullptr, kNoKey, cmd_replace_one},
     // Pattern and track
     {fourcc("Pclr"), "Pattern Clear", Menu::Pattern, nullptr, kNoKey, cmd_clear_cells},
     {fourcc("Pcut"), "Pattern Cut", Menu::Pattern, nullptr, ctrl('x'), cmd_cut_cells},

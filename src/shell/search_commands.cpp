@@ -1,5 +1,6 @@
 // Searching the song: find, find and replace by masks, and the instrument searches.
 #include <algorithm>
+#include <string>
 
 #include "edit/pattern_edits.h"
 #include "shell/command_handlers.h"
@@ -41,27 +42,63 @@ bool jump_to_next(Program& p, const EditRange& range, const CellMask& mask) {
     return true;
 }
 
+// The block's marks outlive the block: without one marked they name cells nobody chose.
+bool no_block(Program& p, EditRange::Kind scope, const char* to) {
+    if (scope != EditRange::Kind::Block || p.editor.block.active) return false;
+    p.say(std::string("No block is marked to ") + to);
+    return true;
+}
+
+bool no_replacement(Program& p) {
+    if (p.editor.search.replace.any_field()) return false;
+    p.say("The replacement sets no field");
+    return true;
+}
+
+// Every range but a block holds the cursor's cell.
+bool holds_cursor(const EditRange& range, const CursorPlace& at) {
+    if (range.kind != EditRange::Kind::Block) return true;
+    const CellBlock& b = range.block;
+    return at.track >= std::min(b.first_track, b.last_track) &&
+           at.track <= std::max(b.first_track, b.last_track) && at.row >= std::min(b.first_row, b.last_row) &&
+           at.row <= std::max(b.first_row, b.last_row);
+}
+
 }  // namespace
 
 void cmd_find_next(Program& p, const ShellMessage&) {
     const SearchState& s = p.editor.search;
-    if (s.scope == EditRange::Kind::Block && !p.editor.block.active) {
-        p.say("No block is marked to search in");
-        return;
-    }
+    if (no_block(p, s.scope, "search in")) return;
     if (!jump_to_next(p, search_range(p, s.scope), s.find)) p.say("Not found");
 }
 
 void cmd_replace_all(Program& p, const ShellMessage&) {
     const SearchState& s = p.editor.search;
-    if (!s.replace.any_field()) {
-        p.say("The replacement sets no field");
-        return;
-    }
+    if (no_block(p, s.scope, "replace in") || no_replacement(p)) return;
     const EditRange range = search_range(p, s.scope);
     int replaced = 0;
     p.edit("Replace", [&](SongTransaction& t) { replaced = replace_all(t, range, s.find, s.replace); });
     p.say(std::to_string(replaced) + " cells replaced");
+}
+
+void cmd_replace_one(Program& p, const ShellMessage&) {
+    const SearchState& s = p.editor.search;
+    if (no_block(p, s.scope, "replace in") || no_replacement(p)) return;
+    const EditRange range = search_range(p, s.scope);
+    const CursorPlace at = cursor_place(p);
+    bool replaced = false;
+    if (holds_cursor(range, at)) {
+        // replace_all over the one cell: it writes only when the cell is a hit.
+        const int pattern = p.engine.bank.current().sequence[position(p)];
+        const EditRange cell = EditRange::of_block({pattern, at.track, at.row, at.track, at.row});
+        p.edit("Replace",
+               [&](SongTransaction& t) { replaced = replace_all(t, cell, s.find, s.replace) > 0; });
+    }
+    const bool found = jump_to_next(p, range, s.find);
+    if (replaced)
+        p.say(found ? "1 cell replaced" : "1 cell replaced, no more found");
+    else if (!found)
+        p.say("Not found");
 }
 
 void cmd_find_unused_instruments(Program& p, const ShellMessage&) {

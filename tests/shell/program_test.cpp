@@ -5,6 +5,7 @@
 
 #include <filesystem>
 
+#include "shell/editor_cursor.h"
 #include "support/temp_dir.h"
 
 namespace ondrel {
@@ -199,6 +200,68 @@ TEST(AlertKeys, EnterNeverTakesADestructiveChoiceAndEscapeTakesCancelOrTheFirst)
         SCOPED_TRACE(c.buttons.empty() ? "no buttons" : c.buttons.front());
         EXPECT_EQ(enter_button(alert), c.enter);
         EXPECT_EQ(escape_button(alert), c.escape);
+    }
+}
+
+// Find and replace over notes 49 at (row 0, track 0), (2, 1) and (4, 0); 49 becomes 50.
+TEST(ProgramSearch, ReplaceTakesTheHitUnderTheCursorThenFindsTheNextAndNeverLeavesTheScope) {
+    using Kind = EditRange::Kind;
+    struct Case {
+        const char* name;
+        Kind scope;
+        bool block;  // the block over rows 0 to 4 of track 0 marked; else its marks stay, unmarked
+        CursorPlace cursor;
+        const char* code;
+        std::vector<int> notes;  // of the three cells, in reading order
+        CursorPlace then;
+        const char* said;
+    };
+    // clang-format off
+    const Case cases[] = {
+        {"replace all, no block marked", Kind::Block, false, {0, 0}, "Srpl", {49, 49, 49}, {0, 0},
+         "No block is marked to replace in"},
+        {"replace all in the block", Kind::Block, true, {0, 0}, "Srpl", {50, 49, 50}, {0, 0}, "2 cells replaced"},
+        {"replace all in the pattern", Kind::Pattern, false, {1, 1}, "Srpl", {50, 50, 50}, {1, 1},
+         "3 cells replaced"},
+        {"replace on a hit", Kind::Pattern, false, {0, 0}, "Srp1", {50, 49, 49}, {2, 1}, "1 cell replaced"},
+        {"replace on no hit only finds", Kind::Pattern, false, {1, 0}, "Srp1", {49, 49, 49}, {2, 1}, ""},
+        {"replace the last hit, wrapping", Kind::Pattern, false, {4, 0}, "Srp1", {49, 49, 50}, {0, 0},
+         "1 cell replaced"},
+        {"replace the track's only hit", Kind::Track, false, {2, 1}, "Srp1", {49, 50, 49}, {2, 1},
+         "1 cell replaced, no more found"},
+        {"replace outside the block only finds", Kind::Block, true, {2, 1}, "Srp1", {49, 49, 49}, {4, 0}, ""},
+        {"replace, no block marked", Kind::Block, false, {0, 0}, "Srp1", {49, 49, 49}, {0, 0},
+         "No block is marked to replace in"},
+    };
+    // clang-format on
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        Program p;
+        // An edit swaps in a copy of the pattern: look it up each time.
+        const auto notes = [&] {
+            const Pattern& now = *p.engine.bank.song_pattern(0);
+            return std::vector<int>{now.col[0][0].note, now.col[1][2].note, now.col[0][4].note};
+        };
+        Pattern& pattern = *p.engine.bank.song_pattern(0);
+        pattern.col[0][0].note = pattern.col[1][2].note = pattern.col[0][4].note = 49;
+        p.editor.search.scope = c.scope;
+        p.editor.search.find.note = 49;
+        p.editor.search.replace.note = 50;
+        p.editor.block = {c.block, 0, 0, 0, 4};
+        set_cursor_place(p, c.cursor);
+        p.post(fourcc(*reinterpret_cast<const char(*)[5]>(c.code)));
+        p.run_pending();
+        EXPECT_EQ(notes(), c.notes);
+        EXPECT_EQ(std::make_pair(cursor_place(p).row, cursor_place(p).track),
+                  std::make_pair(c.then.row, c.then.track));
+        EXPECT_EQ(p.last_said(), c.said);
+        // All of it one undo step.
+        const bool changed = c.notes != std::vector<int>{49, 49, 49};
+        EXPECT_EQ(p.history().can_undo(), changed);
+        p.post(fourcc("UNDO"));
+        p.run_pending();
+        EXPECT_EQ(notes(), (std::vector<int>{49, 49, 49}));
+        EXPECT_FALSE(p.history().can_undo());
     }
 }
 

@@ -61,6 +61,10 @@ void draw_search_window(Program& p) {
     ImGui::Separator();
     if (ImGui::Button("Find Next (F3)")) p.post(fourcc("Sfnd"));
     ImGui::SameLine();
+    if (ImGui::Button("Replace")) p.post(fourcc("Srp1"));
+    if (ImGui::IsItemHovered())
+        ImGui::SetTooltip("Replaces the cell under the cursor if it is found, then finds the next");
+    ImGui::SameLine();
     if (ImGui::Button("Replace All")) p.post(fourcc("Srpl"));
     ImGui::End();
 }
