@@ -146,8 +146,9 @@ void editor_key_down(Program& p, const KeyChord& chord, bool repeat) {
     if (editing && chord.key == kKeyInsert) return shift_rows(p, true);
     if (editing && chord.key == kKeyBackspace) return shift_rows(p, false);
 
+    // Outside edit mode the piano plays from any column; in it, digits go into the field.
     const CursorPlace place = cursor_place(p);
-    if (place.field == kFieldNote) {
+    if (place.field == kFieldNote || !editing) {
         if (editing && is_note_off_key(chord.key) && !repeat) {
             TNOTE cell = cell_at(p, place.track, place.row);
             cell.note = 0x80;

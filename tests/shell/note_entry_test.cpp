@@ -2,6 +2,7 @@
 // what lands in the pattern, where the cursor goes, chords, blocks, and undo.
 #include <gtest/gtest.h>
 
+#include "shell/editor_cursor.h"
 #include "shell/note_keys.h"
 #include "shell/program.h"
 
@@ -91,6 +92,40 @@ TEST_F(NoteEntry, KeysWriteOnlyInEditModeAndMoveByTheJumpStep) {
     EXPECT_EQ(cell(0, 6).note, 0);
     EXPECT_EQ(cell(0, 3).note, 0);
     EXPECT_EQ(cell(0, 0).note, 60);
+}
+
+TEST_F(NoteEntry, OutsideEditModeTheKeysPlayFromAnyFieldInItDigitsGoIntoTheField) {
+    struct Case {
+        bool edit_mode;
+        int field;
+        char key;
+        int heard;         // the note played; 0: none
+        TNOTE cell_after;  // at row 0 of track 1
+    };
+    const Case cases[] = {
+        {false, kFieldNote, 'z', 60, {}},
+        {false, kFieldInstrument0, 'c', 64, {}},
+        {false, kFieldVolume2, 'q', 72, {}},
+        {false, kFieldParameter1, 'm', 71, {}},
+        {false, kFieldVolume0, 'a', 0, {}},  // no piano key
+        {true, kFieldNote, 'z', 60, {60, 0, 0, 1, 0, 0}},
+        {true, kFieldInstrument1, '2', 0, {0, 0, 0, 2, 0, 0}},  // a piano key, but a digit here
+        {true, kFieldCommand, 'c', 0, {0, 0, 0, 0, 12, 0}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(std::string(1, c.key) + " in field " + std::to_string(c.field) +
+                     (c.edit_mode ? " editing" : ""));
+        Program q;
+        q.editor.edit_mode = c.edit_mode;
+        set_cursor_place(q, {0, 1, c.field});
+        q.key_down({c.key, kModNone});
+        q.run_pending();
+        q.key_up({c.key, kModNone});
+        const bool heard = q.engine.player.tr.afpending.load() != 0;
+        EXPECT_EQ(heard ? int(q.engine.player.tr.afnote.note) : 0, c.heard);
+        EXPECT_EQ(heard ? int(q.engine.player.tr.aftrack) : 1, 1);
+        EXPECT_EQ(q.engine.bank.song_pattern(0)->col[1][0], c.cell_after);
+    }
 }
 
 TEST_F(NoteEntry, KeysHeldTogetherMakeAChordAcrossTracks) {
