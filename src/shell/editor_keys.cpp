@@ -140,6 +140,13 @@ void editor_key_down(Program& p, const KeyChord& chord, bool repeat) {
         p.say("Octave " + std::to_string(p.editor.octave));
         return;
     }
+    if (chord.key == kKeyPadDivide || chord.key == kKeyPadMultiply) {
+        const int slot = std::clamp(p.engine.player.cursor.cursnd + (chord.key == kKeyPadMultiply ? 1 : -1),
+                                    0, kSamplesPerSong - 1);
+        p.post(ShellMessage(fourcc("ILsl")).with("instrument", slot + 1));
+        p.say("Instrument " + std::to_string(slot + 1));
+        return;
+    }
     if (chord.mods & (kModCtrl | kModAlt)) return;
     const bool editing = p.editor.edit_mode;
     if (editing && chord.key == kKeyDelete) return clear_under_cursor(p, chord.mods & kModShift);

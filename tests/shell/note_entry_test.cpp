@@ -128,6 +128,31 @@ TEST_F(NoteEntry, OutsideEditModeTheKeysPlayFromAnyFieldInItDigitsGoIntoTheField
     }
 }
 
+TEST_F(NoteEntry, KeypadSlashAndStarChooseThePreviousAndNextInstrument) {
+    struct Case {
+        int16_t before;  // cursnd: the instrument less one
+        int32_t key;
+        int16_t after;
+    };
+    const Case cases[] = {
+        {4, kKeyPadMultiply, 5},
+        {4, kKeyPadDivide, 3},
+        {0, kKeyPadDivide, 0},
+        {127, kKeyPadMultiply, 127},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(std::to_string(c.before) + " " + chord_text(plain(c.key)));
+        p.engine.player.cursor.cursnd = c.before;
+        key(c.key);
+        EXPECT_EQ(p.engine.player.cursor.cursnd, c.after);
+        EXPECT_EQ(p.last_said(), "Instrument " + std::to_string(c.after + 1));
+    }
+    // A note then goes in with it.
+    key(kKeySpace);
+    key('z');
+    EXPECT_EQ(cell(0, 0).instrument, 128);
+}
+
 TEST_F(NoteEntry, KeysHeldTogetherMakeAChordAcrossTracks) {
     key(kKeySpace);
     key('z');
