@@ -115,6 +115,14 @@ void cmd_sound_block(Program& p, const ShellMessage& m) {
         const FrameRange range = range_of(p, m);
         done =
             p.edit("Set " + block_name(n), [&](SongTransaction& t) { set_sound_block(t, slot, n, range); });
+    } else if (m.code == fourcc("SNbm") && m.has("end")) {
+        // A dragged end mark: the block keeps its start and at least one frame, since an
+        // empty range would mean the whole sound.
+        const auto first = uint32_t(std::max<int64_t>(0, m.get("first")));
+        const auto end = uint32_t(std::max<int64_t>(first + int64_t{1}, m.get("end")));
+        done = p.edit("Resize " + block_name(n), [&](SongTransaction& t) {
+            set_sound_block(t, slot, n, {first, end});
+        });
     } else if (m.code == fourcc("SNbm")) {
         const auto first = uint32_t(std::max<int64_t>(0, m.get("first")));
         done =

@@ -5,6 +5,7 @@
 
 #include <filesystem>
 
+#include "edit/sound_blocks.h"
 #include "shell/editor_cursor.h"
 #include "support/temp_dir.h"
 
@@ -262,6 +263,36 @@ TEST(ProgramSearch, ReplaceTakesTheHitUnderTheCursorThenFindsTheNextAndNeverLeav
         p.run_pending();
         EXPECT_EQ(notes(), (std::vector<int>{49, 49, 49}));
         EXPECT_FALSE(p.history().can_undo());
+    }
+}
+
+// A sound of 10 frames with block 1 over [4, 8): its start mark dragged moves it, its end
+// mark dragged resizes it; the block stays inside the sound and never empty.
+TEST(ProgramSoundBlocks, AStartMarkMovesTheBlockAndAnEndMarkResizesIt) {
+    struct Case {
+        int64_t first;
+        int64_t end;  // -1: none, a move
+        uint32_t first_after, end_after;
+    };
+    const Case cases[] = {
+        {2, -1, 2, 6}, {9, -1, 6, 10}, {4, 6, 4, 6}, {4, 9, 4, 9}, {4, 2, 4, 5}, {4, 99, 4, 10},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(std::to_string(c.first) + " " + std::to_string(c.end));
+        Program p;
+        SampleRef s = make_sample(10);
+        s->bits = 8;
+        s->framecode = frame_code(8, false);
+        p.engine.bank.t_sound[size_t(p.engine.player.cursor.cursnd)] = std::move(s);
+        p.post(ShellMessage(fourcc("SNbk")).with("block", 1).with("first", 4).with("end", 8));
+        ShellMessage drag(fourcc("SNbm"));
+        drag.with("block", 1).with("first", c.first);
+        if (c.end >= 0) drag.with("end", c.end);
+        p.post(drag);
+        p.run_pending();
+        const auto block = sound_block(p.engine.bank.current(), p.engine.player.cursor.cursnd, 1, 10);
+        ASSERT_TRUE(block);
+        EXPECT_EQ(std::make_pair(block->first, block->end), std::make_pair(c.first_after, c.end_after));
     }
 }
 

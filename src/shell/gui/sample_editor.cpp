@@ -187,10 +187,12 @@ void SampleEditor::waveform(Program& p, const p_s& s, ImVec2 size) {
     for (int n = 1; n <= kSoundBlocks; ++n) {
         const auto block = sound_block(song, slot, n, frames);
         if (!block) continue;
-        const double start = drag_ == Drag::Block && dragged_block_ == n ? dragged_ : block->first;
-        const double length = double(block->end) - double(block->first);
+        const bool dragged = dragged_block_ == n && (drag_ == Drag::Block || drag_ == Drag::BlockEnd);
+        const double start = dragged && drag_ == Drag::Block ? dragged_ : block->first;
+        const double end =
+            dragged && drag_ == Drag::BlockEnd ? dragged_ : start + double(block->end) - double(block->first);
         vertical(start, kBlock, block_name(n).c_str());
-        vertical(start + length, kBlock, nullptr);
+        vertical(end, kBlock, nullptr);
     }
 
     const ImGuiIO& io = ImGui::GetIO();
@@ -208,15 +210,21 @@ void SampleEditor::waveform(Program& p, const p_s& s, ImVec2 size) {
             drag_ = Drag::LoopStart;
         else if (s.loopon && near(loop_end))
             drag_ = Drag::LoopEnd;
-        for (int n = 1; n <= kSoundBlocks && drag_ == Drag::Select; ++n)
-            if (const auto block = sound_block(song, slot, n, frames); block && near(block->first)) {
-                drag_ = Drag::Block;
-                dragged_block_ = n;
-            }
+        // A start mark moves its block; an end mark resizes it.
+        for (int n = 1; n <= kSoundBlocks && drag_ == Drag::Select; ++n) {
+            const auto block = sound_block(song, slot, n, frames);
+            if (!block || !(near(block->first) || near(block->end))) continue;
+            drag_ = near(block->first) ? Drag::Block : Drag::BlockEnd;
+            dragged_block_ = n;
+            block_first_ = block->first;
+        }
         dragged_ = mouse_frame;
     }
     if (drag_ == Drag::None) return;
     dragged_ = mouse_frame;
+    // An end kept after its start: the block never shrinks to nothing or turns over.
+    if (drag_ == Drag::BlockEnd)
+        dragged_ = std::clamp(dragged_, std::min(block_first_ + 1, double(frames)), double(frames));
     if (drag_ == Drag::Select && std::abs(dragged_ - anchor_) >= per_pixel_)
         dl->AddRectFilled(ImVec2(x_of(std::min(anchor_, dragged_), at.x), at.y),
                           ImVec2(x_of(std::max(anchor_, dragged_), at.x), at.y + size.y), kSelection);
@@ -244,6 +252,12 @@ void SampleEditor::waveform(Program& p, const p_s& s, ImVec2 size) {
             break;
         case Drag::Block:
             p.post(ShellMessage(fourcc("SNbm")).with("block", dragged_block_).with("first", frame));
+            break;
+        case Drag::BlockEnd:
+            p.post(ShellMessage(fourcc("SNbm"))
+                       .with("block", dragged_block_)
+                       .with("first", static_cast<int64_t>(block_first_))
+                       .with("end", frame));
             break;
         case Drag::None: break;
     }

@@ -20,7 +20,7 @@ public:
     void draw(Program& p);
 
 private:
-    enum class Drag : uint8_t { None, Select, LoopStart, LoopEnd, Block };
+    enum class Drag : uint8_t { None, Select, LoopStart, LoopEnd, Block, BlockEnd };
     void toolbar(Program& p, const p_s* s);
     void waveform(Program& p, const p_s& s, ImVec2 size);
     void compute_peaks(const p_s& s, int width);
@@ -35,6 +35,7 @@ private:
     double anchor_ = 0;   // where a selection began
     double dragged_ = 0;  // where a dragged line is now
     int dragged_block_ = 0;
+    double block_first_ = 0;  // where the block whose end is dragged starts
     // The waveform as drawn, kept until the sound or the view changes: the lowest and
     // highest value of each channel under each column.
     const void* peaks_of_ = nullptr;
