@@ -3,6 +3,7 @@
 #include "edit/sound_edits.h"
 
 #include "edit/sound_blocks.h"
+#include "edit/sound_frames.h"
 #include "edit/sound_test_support.h"
 
 namespace ondrel {
@@ -66,17 +67,51 @@ TEST_P(SoundTools, GiveExactValuesAndUndoGivesTheSoundBack) {
 INSTANTIATE_TEST_SUITE_P(EachFormat, SoundTools, ::testing::ValuesIn(kToolCases),
                          [](const auto& i) { return test_name(i.param.name); });
 
-// Frames 0..9 (8-bit mono) looping over bytes 2..8, block 1 over [6, 9), block 2 [1, 3);
-// the clip is two 16-bit stereo frames, 3 and -3 in the sound's format.
+// Frames 0..9 of each format looping over frames 2..8 (bytes in the record), block 1
+// over [6, 9), block 2 [1, 3); the clip is two 16-bit stereo frames, A and B, which a paste
+// converts to the sound's format.
 SoundClip two_frames() {
     const SampleRef from = make_sound(k16Stereo, {512, 1024, -512, -1024});
     return {16, true, 44100, std::vector<uint8_t>(from->data, from->data + from->length)};
 }
+// In a case's frame list: the clip's frames, and a silent frame.
+constexpr int kClipA = 1000, kClipB = -1000, kSilent = 2000;
+
+struct FrameFormat {
+    const char* name;
+    test::SoundFormat format;
+    std::vector<int> clip_a, clip_b;  // the clip's frames converted to the format
+};
+const FrameFormat kFrameFormats[] = {
+    {"EightBitMono", k8Mono, {3}, {-3}},
+    {"EightBitStereo", k8Stereo, {2, 4}, {-2, -4}},
+    {"SixteenBitStereo", k16Stereo, {512, 1024}, {-512, -1024}},
+};
+
+// Sample values of frames: frame v is v, and v + 50 on the right channel.
+std::vector<int> samples_of(const FrameFormat& f, const std::vector<int>& frames) {
+    std::vector<int> out;
+    for (int v : frames) {
+        if (v == kSilent) {
+            out.insert(out.end(), f.format.stereo ? 2 : 1, 0);
+            continue;
+        }
+        if (v == kClipA || v == kClipB) {
+            const auto& clip = v == kClipA ? f.clip_a : f.clip_b;
+            out.insert(out.end(), clip.begin(), clip.end());
+            continue;
+        }
+        out.push_back(v);
+        if (f.format.stereo) out.push_back(v + 50);
+    }
+    return out;
+}
+
 struct FrameCase {
     const char* name;
     std::function<bool(SongTransaction&)> edit;
-    std::vector<int> after;
-    const char* marks;  // the loop and the blocks afterwards, as described below
+    std::vector<int> after;  // frames
+    const char* marks;       // the loop and the blocks afterwards, in frames
 };
 // clang-format off
 const FrameCase kFrameCases[] = {
@@ -86,25 +121,33 @@ const FrameCase kFrameCases[] = {
     {"cut all", [](auto& t) { return cut_frames(t, kSlot, {}); }, {}, "loop off 0..0"},
     {"crop", [](auto& t) { return crop_to_frames(t, kSlot, {2, 7}); }, {2, 3, 4, 5, 6},
      "loop on 0..5, block 1 4..5, block 2 0..1"},
-    {"silence to the end", [](auto& t) { return silence_frames(t, kSlot, {8, 10}); }, {0, 1, 2, 3, 4, 5, 6, 7, 0, 0},
-     "loop on 2..8, block 1 6..9, block 2 1..3"},
+    {"silence to the end", [](auto& t) { return silence_frames(t, kSlot, {8, 10}); },
+     {0, 1, 2, 3, 4, 5, 6, 7, kSilent, kSilent}, "loop on 2..8, block 1 6..9, block 2 1..3"},
     {"paste where a block starts", [](auto& t) { return paste_frames(t, kSlot, 6, two_frames()); },
-     {0, 1, 2, 3, 4, 5, 3, -3, 6, 7, 8, 9}, "loop on 2..10, block 1 8..11, block 2 1..3"},
+     {0, 1, 2, 3, 4, 5, kClipA, kClipB, 6, 7, 8, 9}, "loop on 2..10, block 1 8..11, block 2 1..3"},
     {"paste where a block ends", [](auto& t) { return paste_frames(t, kSlot, 9, two_frames()); },
-     {0, 1, 2, 3, 4, 5, 6, 7, 8, 3, -3, 9}, "loop on 2..8, block 1 6..9, block 2 1..3"},
+     {0, 1, 2, 3, 4, 5, 6, 7, 8, kClipA, kClipB, 9}, "loop on 2..8, block 1 6..9, block 2 1..3"},
     {"paste past the end", [](auto& t) { return paste_frames(t, kSlot, 99, two_frames()); },
-     {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 3, -3}, "loop on 2..8, block 1 6..9, block 2 1..3"},
+     {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, kClipA, kClipB}, "loop on 2..8, block 1 6..9, block 2 1..3"},
 };
 // clang-format on
 
-class FrameEdits : public test::EditFixture, public ::testing::WithParamInterface<FrameCase> {
+class FrameEdits : public test::EditFixture,
+                   public ::testing::WithParamInterface<std::tuple<FrameFormat, FrameCase>> {
 protected:
+    // Loop points are bytes: one off a frame's start shows as "+N bytes".
+    static std::string frame_text(uint32_t bytes, uint32_t frame_bytes) {
+        std::string text = std::to_string(bytes / frame_bytes);
+        if (bytes % frame_bytes) text += "+" + std::to_string(bytes % frame_bytes) + " bytes";
+        return text;
+    }
     std::string marks() const {
         const p_s& s = *sound(kSlot);
-        std::string text = std::string("loop ") + (s.loopon ? "on " : "off ") + std::to_string(s.loopstart) +
-                           ".." + std::to_string(s.loopend);
+        const uint32_t frame_bytes = uint32_t(s.bits / 8) * (s.stereo ? 2 : 1);
+        std::string text = std::string("loop ") + (s.loopon ? "on " : "off ") +
+                           frame_text(s.loopstart, frame_bytes) + ".." + frame_text(s.loopend, frame_bytes);
         for (int n = 1; n <= kSoundBlocks; ++n)
-            if (const auto b = sound_block(engine.bank.current(), kSlot, n, s.length))
+            if (const auto b = sound_block(engine.bank.current(), kSlot, n, sound_frames(&s)))
                 text += ", block " + std::to_string(n) + " " + std::to_string(b->first) + ".." +
                         std::to_string(b->end);
         return text;
@@ -112,23 +155,29 @@ protected:
 };
 
 TEST_P(FrameEdits, MoveLoopAndBlocksWithTheFramesAndUndo) {
-    const FrameCase& c = GetParam();
-    SampleRef s = make_sound(k8Mono, {0, 1, 2, 3, 4, 5, 6, 7, 8, 9});
+    const auto& [format, c] = GetParam();
+    SampleRef s = make_sound(format.format, samples_of(format, {0, 1, 2, 3, 4, 5, 6, 7, 8, 9}));
+    const uint32_t frame_bytes = uint32_t(format.format.bits / 8) * (format.format.stereo ? 2 : 1);
     s->loopon = 1;
-    s->loopstart = 2;
-    s->loopend = 8;
+    s->loopstart = 2 * frame_bytes;
+    s->loopend = 8 * frame_bytes;
     put_sound(kSlot, std::move(s));
     edit([](SongTransaction& t) {
         return set_sound_block(t, kSlot, 1, {6, 9}) && set_sound_block(t, kSlot, 2, {1, 3});
     });
     const auto before = snapshot(kSlot);
     ASSERT_TRUE(edit(c.edit));
-    EXPECT_EQ(values_of(sound(kSlot)), c.after);
+    EXPECT_EQ(values_of(sound(kSlot)), samples_of(format, c.after));
     EXPECT_EQ(marks(), c.marks);
     EXPECT_TRUE(undo() && snapshot(kSlot) == before);
 }
-INSTANTIATE_TEST_SUITE_P(EightBitMono, FrameEdits, ::testing::ValuesIn(kFrameCases),
-                         [](const auto& i) { return test_name(i.param.name); });
+INSTANTIATE_TEST_SUITE_P(EachFormat, FrameEdits,
+                         ::testing::Combine(::testing::ValuesIn(kFrameFormats),
+                                            ::testing::ValuesIn(kFrameCases)),
+                         [](const auto& i) {
+                             return std::string(std::get<0>(i.param).name) + "_" +
+                                    test_name(std::get<1>(i.param).name);
+                         });
 
 class SoundClips : public test::EditFixture {};
 
