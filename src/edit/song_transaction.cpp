@@ -7,26 +7,6 @@
 
 namespace ondrel {
 
-PatternRef copy_pattern(const Pattern& pattern) {
-    auto copy = std::make_unique<Pattern>();
-    copy->nrows = pattern.nrows;
-    for (int t = 0; t < kTracks; ++t) {
-        if (!pattern.col[t]) continue;
-        copy->col[t] = std::make_unique_for_overwrite<TNOTE[]>(static_cast<size_t>(pattern.nrows));
-        std::memcpy(copy->col[t].get(), pattern.col[t].get(), sizeof(TNOTE) * size_t(pattern.nrows));
-    }
-    return copy;
-}
-
-SampleRef copy_sample(const p_s& sample) {
-    SampleRef copy = make_sample(sample.length);
-    uint8_t* const data = copy->data;
-    std::memcpy(static_cast<void*>(copy.get()), &sample, sizeof(p_s));
-    copy->data = sample.data ? data : nullptr;
-    if (sample.data && sample.length) std::memcpy(data, sample.data, sample.length);
-    return copy;
-}
-
 SongTransaction::SongTransaction(SongBank& bank, EffectSlots& slots, std::string label)
     : bank_(bank), slots_(slots), label_(std::move(label)), song_(bank.noimod) {}
 

@@ -67,7 +67,4 @@ private:
     std::optional<ReverbDHSSettings> reverb_dhs_;
 };
 
-PatternRef copy_pattern(const Pattern& pattern);
-SampleRef copy_sample(const p_s& sample);
-
 }  // namespace ondrel

@@ -1,5 +1,7 @@
 #include "song/pattern.h"
 
+#include <cstring>
+
 namespace ondrel {
 
 int Pattern::allocated_tracks() const {
@@ -18,6 +20,17 @@ PatternRef make_pattern(int tracks, int rows) {
     p->nrows = rows > 0 ? rows : 1;
     p->allocate(tracks);
     return p;
+}
+
+PatternRef copy_pattern(const Pattern& pattern) {
+    auto copy = std::make_unique<Pattern>();
+    copy->nrows = pattern.nrows;
+    for (int t = 0; t < kTracks; ++t) {
+        if (!pattern.col[t]) continue;
+        copy->col[t] = std::make_unique_for_overwrite<TNOTE[]>(static_cast<size_t>(pattern.nrows));
+        std::memcpy(copy->col[t].get(), pattern.col[t].get(), sizeof(TNOTE) * size_t(pattern.nrows));
+    }
+    return copy;
 }
 
 }  // namespace ondrel

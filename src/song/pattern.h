@@ -25,5 +25,7 @@ struct Pattern {
 using PatternRef = std::unique_ptr<Pattern>;
 
 PatternRef make_pattern(int tracks, int rows);
+// A pattern of its own with the same columns and cells.
+PatternRef copy_pattern(const Pattern& pattern);
 
 }  // namespace ondrel

@@ -34,6 +34,15 @@ SampleRef make_sample(uint32_t length) {
     return sample_in_place(make_sample_block(sizeof(p_s) + size_t{length} + kSampleSlack), length);
 }
 
+SampleRef copy_sample(const p_s& sample) {
+    SampleRef copy = make_sample(sample.length);
+    uint8_t* const data = copy->data;
+    std::memcpy(static_cast<void*>(copy.get()), &sample, sizeof(p_s));
+    copy->data = sample.data ? data : nullptr;
+    if (sample.data && sample.length) std::memcpy(data, sample.data, sample.length);
+    return copy;
+}
+
 void Raz_data(p_s& s) {
     uint8_t* const data = s.data;
     const uint32_t length = s.length;

@@ -59,6 +59,8 @@ using SampleRef = std::unique_ptr<p_s, SampleFree>;
 // Allocates a zero-filled record for length data bytes (plus the slack), resets its
 // header (Raz_data), and points data at the bytes after the header.
 SampleRef make_sample(uint32_t length);
+// A record of its own with the same header and data.
+SampleRef copy_sample(const p_s& sample);
 
 // Zero-filled memory from the allocator sample records come from, for a recorder that fills
 // it first and makes it a record afterwards (sample_in_place).

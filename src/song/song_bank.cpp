@@ -1,6 +1,7 @@
 #include "song/song_bank.h"
 
 #include <algorithm>
+#include <cstring>
 #include <mutex>
 #include <utility>
 
@@ -187,6 +188,19 @@ void SongBank::killmusic() {
         noimod = static_cast<int16_t>(std::min<int>(song, nbimod - 1));
     }
     nbvoie = current().nbtrack;
+}
+
+SongData copy_song(SongBank& bank, int song) {
+    SongData copy;
+    {
+        std::lock_guard<StructureLock> guard(bank.structure_lock());
+        std::memcpy(static_cast<void*>(copy.mod.get()), bank.timod[song].get(), sizeof(TMOD));
+    }
+    for (int i = 0; i < kPatternsPerSong; ++i)
+        if (const Pattern* p = bank.pattern(song * kPatternsPerSong + i)) copy.patterns[i] = copy_pattern(*p);
+    for (int i = 0; i < kSamplesPerSong; ++i)
+        if (const p_s* s = bank.sample(song * kSamplesPerSong + i)) copy.samples[i] = copy_sample(*s);
+    return copy;
 }
 
 }  // namespace ondrel

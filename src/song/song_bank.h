@@ -87,4 +87,8 @@ private:
     StructureLock* lock_ = &no_lock_;
 };
 
+// A copy of song's record, patterns and samples, to play on the side. The record is copied
+// under the structure lock: the sequencer writes some of its fields while it plays.
+SongData copy_song(SongBank& bank, int song);
+
 }  // namespace ondrel
