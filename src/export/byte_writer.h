@@ -5,7 +5,8 @@
 
 namespace ondrel {
 
-// Appends little-endian values to a byte vector; chunks get their length patched in.
+// Appends values to a byte vector, little-endian unless named otherwise; chunks get their
+// length patched in.
 class ByteWriter {
 public:
     std::vector<uint8_t> bytes;
@@ -18,6 +19,10 @@ public:
     void u32le(uint32_t v) {
         u16le(static_cast<uint16_t>(v));
         u16le(static_cast<uint16_t>(v >> 16));
+    }
+    void u16be(uint16_t v) {
+        u8(static_cast<uint8_t>(v >> 8));
+        u8(static_cast<uint8_t>(v));
     }
     void raw(const void* p, size_t n) {
         const auto* b = static_cast<const uint8_t*>(p);
@@ -39,6 +44,10 @@ public:
     void end_chunk(size_t at) {
         const uint32_t len = static_cast<uint32_t>(bytes.size() - at - 4);
         for (int i = 0; i < 4; ++i) bytes[at + i] = static_cast<uint8_t>(len >> (8 * i));
+    }
+    void end_chunk_be(size_t at) {
+        const uint32_t len = static_cast<uint32_t>(bytes.size() - at - 4);
+        for (int i = 0; i < 4; ++i) bytes[at + i] = static_cast<uint8_t>(len >> (24 - 8 * i));
     }
 };
 
