@@ -59,6 +59,8 @@ public:
     void gere_play();
     // Voice for the next note of track (polyphony by the track's nbvoice).
     int track_to_poly(int track);
+    // The instrument of the voice that track (0..63) plays its notes on now.
+    int track_instrument(int track) const { return nlist[curvoice_[track]].instrument; }
     // Value of envelope kind (0..4, or 16) for voice, whose sample is length long.
     float compute_adsr(int kind, unsigned voice, unsigned long length, const p_s* env) const;
 
