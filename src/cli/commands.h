@@ -18,6 +18,7 @@ int cmd_set_sound(const Args& args);
 int cmd_edit_sound(const Args& args);
 int cmd_play(const Args& args);
 int cmd_render(const Args& args);
+int cmd_export_midi(const Args& args);
 int cmd_record(const Args& args);
 int cmd_spectrogram(const Args& args);
 

@@ -17,6 +17,8 @@ const Command kCommands[] = {
     {"play", "play FILE [OPTIONS]     play a song on the sound card, with a status line", ondrel::cmd_play},
     {"render", "render FILE -o OUT     render a song to a WAV file, faster than real time",
      ondrel::cmd_render},
+    {"export-midi", "export-midi FILE -o OUT.mid   write what the sequencer plays as a standard MIDI file",
+     ondrel::cmd_export_midi},
     {"record", "record -o OUT.wav      record the sound input, or with --song SONG a song's own output",
      ondrel::cmd_record},
     {"spectrogram", "spectrogram FILE -o OUT.png   draw the analyser's Radar view of a whole song",

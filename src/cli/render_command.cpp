@@ -5,6 +5,7 @@
 
 #include "cli/cli_load.h"
 #include "cli/commands.h"
+#include "cli/console.h"
 #include "cli/song_output_args.h"
 #include "cli/sound_options.h"
 #include "export/wav_writer.h"
@@ -24,17 +25,6 @@ void render_usage(std::ostream& out) {
            "  --float              32-bit float samples instead of 16-bit\n"
            "  --quiet              no progress bar\n"
         << sound_options_help();
-}
-
-void show_progress(const Player& player, const TMOD& song, double seconds) {
-    const int positions = std::max<int>(song.nbpos, 1);
-    const int at = std::min<int>(player.tr.nopat, positions);
-    const int width = 30;
-    const int filled = at * width / positions;
-    std::fprintf(stderr, "\r[%.*s%.*s] position %3d/%-3d %3d:%02d rendered", filled,
-                 "##############################", width - filled, "..............................", at,
-                 positions, static_cast<int>(seconds) / 60, static_cast<int>(seconds) % 60);
-    std::fflush(stderr);
 }
 
 }  // namespace
@@ -69,7 +59,7 @@ int cmd_render(const Args& args) {
             if (!wav.write(frames, static_cast<size_t>(count))) return false;
             const auto now = std::chrono::steady_clock::now();
             if (progress && now - last_shown > std::chrono::milliseconds(100)) {
-                show_progress(engine.player, song, seconds);
+                show_song_progress(engine.player, song, seconds, "rendered");
                 last_shown = now;
             }
             return true;

@@ -142,6 +142,16 @@ with tempfile.TemporaryDirectory() as tmp:
             check(f"render to {device}", r.returncode == (0 if ok else 1) and r.stderr == want
                   and stat.S_ISCHR(os.stat(device).st_mode), (r.returncode, r.stderr))
 
+    # The song as a MIDI file: format 1, 960 ticks a quarter, tracks as the header counts.
+    mid = os.path.join(tmp, "demo.mid")
+    r = run("export-midi", DEMO, "-o", mid)
+    data = open(mid, "rb").read() if os.path.exists(mid) else b""
+    check("export-midi", r.returncode == 0 and data[:4] == b"MThd" and data[8:14] == bytes([0, 1, 0, 7, 3, 0xC0])
+          and data.count(b"MTrk") == 7 and "end of the song" in r.stderr, (r.stderr, data[:14]))
+    for args, code in ((["--help"], 0), ([DEMO], 2), ([os.path.join(tmp, "missing.otm"), "-o", mid], 1),
+                       ([DEMO, "-o", missing_dir], 1)):
+        check(f"export-midi {args}", run("export-midi", *args).returncode == code)
+
     # Live play through SDL's dummy and disk drivers (no sound card needed).
     env = dict(os.environ, SDL_AUDIODRIVER="dummy")
     r = subprocess.run([ONDREL, "play", DEMO, "--max-seconds", "1"], capture_output=True, text=True,
