@@ -106,26 +106,30 @@ void Player::gere_play() {
     } else {
         row = tr.nopos.load(relaxed) + 1;
     }
-    // The row count is that of the pattern being left, even after a jump.
-    const int rows = m.rows[m.sequence[std::clamp(left_pos, 0, kPositions - 1)]];
+    // The row count is that of nopat's pattern: the position being left, even after a jump,
+    // and in the one-track audition the song's position rather than the auditioned one.
+    const int counted = track_mode ? tr.nopat.load(relaxed) : left_pos;
+    const int rows = m.rows[m.sequence[std::clamp(counted, 0, kPositions - 1)]];
     const bool wrapped = row > rows - 1;
     tr.nopos.store(static_cast<int16_t>(wrapped ? 0 : row), relaxed);
     const bool floop = tr.floop.load(relaxed);
-    if (!track_mode && !tr.playp.load(relaxed)) {
-        if (wrapped) ++pos;
-        // A jump past the last position ends the song like running off its end.
-        if (pos >= tr.patend.load(relaxed)) {
-            if (!floop) {
-                tr.playing.store(0, relaxed);
-                to_window.push({kMsgStop});
+    // The end of the song is looked for only where the row wraps: a jump to or past the
+    // last position plays the pattern there first.
+    if (wrapped && !track_mode) {
+        if (!tr.playp.load(relaxed)) {
+            if (++pos >= tr.patend.load(relaxed)) {
+                if (!floop) {
+                    tr.playing.store(0, relaxed);
+                    to_window.push({kMsgStop});
+                }
+                pos = tr.patstart.load(relaxed);
             }
-            pos = tr.patstart.load(relaxed);
+        } else if (!floop) {
+            tr.playing.store(0, relaxed);
+            to_window.push({kMsgStop});
         }
-    } else if (!track_mode && wrapped && !floop) {
-        tr.playing.store(0, relaxed);
-        to_window.push({kMsgStop});
     }
-    if (!track_mode) tr.nopat.store(static_cast<int16_t>(std::clamp(pos, 0, kPositions - 1)), relaxed);
+    tr.nopat.store(static_cast<int16_t>(std::clamp(pos, 0, kPositions - 1)), relaxed);
     if (watching_ && tr.playing.load(relaxed)) mark_visited();
 }
 

@@ -70,10 +70,12 @@ TEST_F(Transport, JumpsAndBreaks) {
         {"break past the rows of the pattern left: one more", even, 13, 0x70, 1, 2, 0, 1},
         {"the break row is decimal", even, 13, 0x12, 1, 1, 12, 1},
         {"position jump", even, 11, 3, 1, 3, 0, 1},
-        {"jump past the end ends the song", even, 11, 9, 1, 0, 0, 0},
+        {"jump past the end plays on there", even, 11, 9, 1, 9, 0, 1},
+        {"and the song ends when its row wraps", even, 11, 9, 65, 0, 0, 0},
     };
     for (const Case& c : cases) {
         make_song(1, {0, 1, 2, 3}, c.rows);
+        song().sequence[9] = 1;  // what the jump past the end finds there
         put(0, 0, 0, 0, 0, c.command, c.parameter);
         tr.nopat = 0;
         play();
@@ -199,17 +201,25 @@ TEST_F(Transport, SingleRowAndAuditions) {
         EXPECT_EQ(tr.nopos, 0);
     }
 
-    // One track of one position, which it stays on.
-    put(1, 0, 0, 48, 1);
-    put(1, 0, 1, 50, 1);
+    // One track of one position, which it stays on and writes to nopat; the rows counted
+    // are those of nopat's pattern.
+    put(1, 1, 0, 48, 1);
+    put(1, 1, 1, 50, 1);
     voice(0).active = 0;
-    player.cursor.poscurv = 0;
+    player.cursor.poscurv = 1;
+    ASSERT_EQ(tr.nopat, 0);
     player.audition_track(1, 1);
     calls(1);
     EXPECT_EQ(voice(1).active, 1);
     EXPECT_EQ(voice(0).active, 0);
+    calls(11);
+    EXPECT_EQ(tr.nopat, 1);
+    EXPECT_EQ(tr.nopos, 2);  // position 0's 8 rows, not the 2 of the one auditioned
+    rows(1);
+    EXPECT_EQ(tr.nopos, 0);
     rows(5);
-    EXPECT_EQ(tr.nopat, 0);
+    EXPECT_EQ(tr.nopat, 1);
+    EXPECT_EQ(tr.nopos, 1);
     EXPECT_EQ(tr.nopatplaytrack, 1);
     EXPECT_EQ(tr.playing, 1);
 }
