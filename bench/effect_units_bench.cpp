@@ -50,10 +50,8 @@ void song_with_every_unit(Engine& e, bool routed) {
     Pattern* p = e.bank.song_pattern(0);
     for (int t = 0; t < 8; ++t) p->col[t][0] = {static_cast<uint8_t>(40 + t * 3), 0, 0, 1, 0, 0};
     const int units[] = {1, 2, 5, 9, 10, 11, 12, 16};
-    if (routed) {
-        e.slots.reserve_send_buffers(8);
+    if (routed)
         for (int t = 0; t < 8; ++t) m.tracke[t] = static_cast<uint16_t>(units[t]);
-    }
     e.mixer.qual = 1;
     e.player.tr.floop = 1;
     e.player.start(false);

@@ -18,7 +18,6 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     *read.song.mod = engine.bank.current();
     if (!readers[data[0] % 4](file, read)) return 0;
     engine.bank.install(0, std::move(read.song));
-    engine.slots.reserve_send_buffers(ondrel::kEffectSlots);
     engine.mixer.qual = data[0] & 4 ? 1 : 0;
     ondrel::render_offline(engine.mixer, engine.player, {512, 3.0}, [](const float*, int, double) { return true; });
     return 0;

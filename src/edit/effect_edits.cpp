@@ -33,7 +33,6 @@ bool write(T& field, int64_t value) {
 int route(SongTransaction& t, int track, int slot) {
     if (slot < 0) return -1;
     TMOD& m = t.record();
-    if (!t.slots().reserve_send_buffers(send_buffers_needed(m.tracke, track, slot))) return -1;
     // Routing words of other banks (trackg) are not read by the mixer: bank 0 only.
     if (m.trackg[track] == 0) m.tracke[track] = static_cast<uint16_t>(slot);
     return slot;

@@ -41,9 +41,6 @@ const char* packer_of(const std::vector<uint8_t>& bytes) {
 namespace {
 
 void apply_effects(const EffectsRead& fx, const TMOD& song, EffectSlots& slots, StructureLock& lock) {
-    if (fx.renumber) slots.clear_numbering();
-    for (int slot : fx.numbered_slots) slots.number_buffer(slot);
-    slots.reserve_send_buffers(slots.nbbufferefx);
     for (int u = 0; u < kEchoUnits; ++u)
         if (fx.echo_units_set & (1u << u)) slots.reserve_echo_line(u, song.echolen[u], lock);
     if (fx.has_added_types) {

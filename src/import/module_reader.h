@@ -15,9 +15,7 @@ namespace ondrel {
 struct EffectsRead {
     bool has_added_types = false;  // slots 20..99 replaced by the file
     std::array<int16_t, kEffectSlots> added_types{};
-    bool renumber = false;            // the file restarts the effect-buffer numbering
-    std::vector<int> numbered_slots;  // effect buffers named by the file, in order
-    uint32_t echo_units_set = 0;      // bit u: echo unit u's line follows the new length
+    uint32_t echo_units_set = 0;  // bit u: echo unit u's line follows the new length
 };
 
 // A module being read: the song as it will be installed, and what the reader saw.

@@ -341,7 +341,7 @@ void chunk_inst(OtmState& st, ByteReader& b) {
 }
 
 // One packed track of a "patt" chunk: cells until the row count is reached.
-void patt_track(ByteReader& b, TNOTE* column, int file_rows, int rows, EffectsRead& fx) {
+void patt_track(ByteReader& b, TNOTE* column, int file_rows, int rows) {
     int row = 0;
     while (row < file_rows && !b.at_end()) {
         uint8_t flag = b.u8();
@@ -356,7 +356,6 @@ void patt_track(ByteReader& b, TNOTE* column, int file_rows, int rows, EffectsRe
         if (flag & 4) cell.volume = b.u8();
         if (flag & 8) cell.command = b.u8();
         if (flag & 16) cell.parameter = b.u8();
-        if (cell.command == 33) fx.numbered_slots.push_back(cell.parameter);
         if (column && row < rows) column[row] = cell;
         ++row;
     }
@@ -373,7 +372,7 @@ void chunk_patt(OtmState& st, ByteReader& b) {
     PatternRef p = make_pattern(std::min<int>(tracks, kTracks), rows);
     for (int t = 0; t < tracks && !b.at_end(); ++t) {
         if (b.u16le() == 65535) continue;
-        patt_track(b, t < kTracks ? p->column(t) : nullptr, file_rows, rows, st.out.effects);
+        patt_track(b, t < kTracks ? p->column(t) : nullptr, file_rows, rows);
     }
     st.out.song.patterns[number] = std::move(p);
 }
@@ -452,7 +451,6 @@ void preset(TMOD& m) {
 bool read_otm(ByteReader& file, ModuleRead& out) {
     TMOD& m = *out.song.mod;
     preset(m);
-    out.effects.renumber = true;
     OtmState st(out);
     int chunks = 0;
     uint8_t header[8];
@@ -479,8 +477,6 @@ bool read_otm(ByteReader& file, ModuleRead& out) {
         out.error = "not an Ondrel Tracker module (no known chunk at its start)";
         return false;
     }
-    for (int t = 0; t < kTracks; ++t)
-        if (m.tracke[t]) out.effects.numbered_slots.push_back(m.tracke[t]);
     m.nbpos = static_cast<uint8_t>(st.nbpos);
     m.repeat = static_cast<uint8_t>(st.repeat);
     m.nbtrack = static_cast<uint8_t>(st.nbtrack);

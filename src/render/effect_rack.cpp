@@ -50,17 +50,9 @@ std::array<uint16_t, kTracks> EffectRack::routing() {
     return words;
 }
 
-bool EffectRack::checkbufferefx(int track, int slot) {
-    uint16_t tracke[kTracks];
-    const std::array<uint16_t, kTracks> words = routing();
-    std::copy(words.begin(), words.end(), tracke);
-    return slots_.reserve_send_buffers(send_buffers_needed(tracke, track, slot));
-}
-
 void EffectRack::route(int track, int slot) {
     TMOD& m = bank_.current();
     // Routing words of other banks (trackg) are not read by the mixer: bank 0 only.
-    if (!checkbufferefx(track, slot)) return;
     std::lock_guard<StructureLock> guard(bank_.structure_lock());
     if (m.trackg[track] == 0) m.tracke[track] = static_cast<uint16_t>(slot);
     player_.efxaffiche[track] = static_cast<int16_t>(slot);

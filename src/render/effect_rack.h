@@ -25,8 +25,6 @@ public:
     std::vector<std::pair<int, std::string>> list() const;
     std::string label(int slot) const;
 
-    // Reserves send buffers for the routing track -> slot would need; false if memory ran out.
-    bool checkbufferefx(int track, int slot);
     // Routes the track to the next slot with a unit above (wrapping 99 to 1) or below it.
     int mnplusefx(int track);
     int mnmoinsefx(int track);

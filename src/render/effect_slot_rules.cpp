@@ -60,19 +60,6 @@ int next_slot_down(const EffectTypes& efxtype, int current) {
     return efxtype[s] ? s : -1;
 }
 
-int send_buffers_needed(const uint16_t (&tracke)[kTracks], int track, int slot) {
-    std::array<bool, kEffectSlots> seen{};
-    int count = 0;
-    for (int t = 0; t < kTracks; ++t) {
-        const int s = t == track ? slot : tracke[t];
-        if (s > 0 && s < kEffectSlots && !seen[s]) {
-            seen[s] = true;
-            ++count;
-        }
-    }
-    return count;
-}
-
 int effect_instance(const EffectTypes& efxtype, int slot) {
     if (slot < kFirstClonedSlot || slot >= kEffectSlots) return 0;
     int k = 0;

@@ -29,9 +29,6 @@ uint64_t remove_clone(EffectTypes& efxtype, uint16_t (&tracke)[kTracks], int slo
 // slot 99 is reached only when the walk starts there. -1 when no slot has a unit.
 int next_slot_up(const EffectTypes& efxtype, int current);
 int next_slot_down(const EffectTypes& efxtype, int current);
-// The send buffers the mixer needs once track is routed to slot: the distinct slots of
-// all tracks.
-int send_buffers_needed(const uint16_t (&tracke)[kTracks], int track, int slot);
 
 // The instance of a slot's unit (echo line, stereo-space line): 0 for the basic slot, then
 // 1, 2... for the clones of the same type in slot order.

@@ -152,8 +152,7 @@ void Mixer::render_piece(float* out, int c0, int n, const TMOD& m, double frame_
                                             : 1.0,
                               qual.load(std::memory_order_relaxed) == 1,
                               m.globalvol * kMasterStep,
-                              m.mode,
-                              slots_.nsendbuffers.load(std::memory_order_acquire)};
+                              m.mode};
     // In index order: the order decides which voice sets a slot's control value.
     for (int w = 0; w < kVoices / 64; ++w) {
         uint64_t& hint = player_.active_hint[w];
@@ -240,7 +239,7 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const
     float send_level = 0;
     const int slot = m.tracke[track];
     const int k = slot > 0 && slot < kEffectSlots ? compact_[slot] : 0;
-    if (k > 0 && k <= piece.sends_ready) {
+    if (k > 0) {
         const float e1 = (env & kEnvSend) ? player_.compute_adsr(1, vi, static_cast<unsigned long>(frames), s)
                                           : static_cast<float>(m.trackc[track]);
         control_[slot] = static_cast<int16_t>(e1);
@@ -351,13 +350,11 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const
 bool Mixer::effect_stage(float* out, int frames, TMOD& m) {
     pass.store(pass.load(std::memory_order_relaxed) + 1, std::memory_order_relaxed);
     if (units_) units_->begin_buffer();
-    const int ready = slots_.nsendbuffers.load(std::memory_order_acquire);
     const auto& pan = tab_pan_;
     bool ran = false;
     for (int r = 0; r < routed_by_slot_count_; ++r) {
         const int s = routed_by_slot_[r];
         const int k = compact_[s];
-        if (k > ready) continue;
         float* send = slots_.pbufferefx[k - 1].get();
         if (!written_[k]) std::fill(send, send + std::min(2 * frames, kSendBufferFloats), 0.0f);
         float el = 1.0f, er = 1.0f;

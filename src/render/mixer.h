@@ -62,7 +62,6 @@ private:
         bool interpolate;     // "Interpolation" chosen for every sample
         float master;         // globalvol / 64
         int mode;             // pan mode
-        int sends_ready;      // send buffers the audio thread may write
     };
 
     void render_call(float* out, int frames, const AudioFormat& format);

@@ -13,34 +13,13 @@ constexpr int kBasicTypes[] = {1, 2, 3, 5, 9, 10, 11, 12, 16, 17};
 
 EffectSlots::EffectSlots() {
     for (int t : kBasicTypes) efxtype[t] = static_cast<int16_t>(t);
+    for (auto& buffer : pbufferefx) buffer = std::make_unique<float[]>(kSendBufferFloats);
 }
 
 bool is_basic_effect_type(int type) {
     for (int t : kBasicTypes)
         if (t == type) return true;
     return false;
-}
-
-void EffectSlots::number_buffer(int slot) {
-    if (slot <= 0 || slot >= kEffectSlots || bufnumber[slot] != 0) return;
-    bufnumber[slot] = static_cast<int16_t>(++nbbufferefx);
-}
-
-void EffectSlots::clear_numbering() {
-    bufnumber.fill(0);
-    nbbufferefx = 0;
-}
-
-bool EffectSlots::reserve_send_buffers(int count) {
-    count = std::min(count, kEffectSlots);
-    int ready = nsendbuffers.load(std::memory_order_relaxed);
-    for (int k = ready; k < count; ++k) {
-        pbufferefx[k].reset(new (std::nothrow) float[kSendBufferFloats]());
-        if (!pbufferefx[k]) break;
-        ready = k + 1;
-    }
-    nsendbuffers.store(ready, std::memory_order_release);
-    return ready >= count;
 }
 
 bool EffectSlots::reserve_echo_line(int unit, uint32_t length, StructureLock& lock) {

@@ -24,24 +24,15 @@ struct EffectSlots {
     // hold the basic units at their own number, 20..99 the clones ("Clone efx", the "efx."
     // chunk); written by the rack and the native reader, read by the mixer and command 33.
     std::array<int16_t, kEffectSlots> efxtype{};
-    // Serial number (1, 2...) the native reader gives each effect buffer a song names,
-    // 0 = none, and how many it numbered.
-    std::array<int16_t, kEffectSlots> bufnumber{};
-    int nbbufferefx = 0;
-    // Send buffers by compact number - 1, 20480 bytes (kSendBufferFloats floats) each, never
-    // freed once made; the mixer sums the voices of a routed slot into one per piece.
+    // Send buffers by compact number - 1, 20480 bytes (kSendBufferFloats floats) each, all
+    // made with the slots, so that routing never waits on memory; the mixer sums the voices
+    // of a routed slot into one per piece.
     std::array<std::unique_ptr<float[]>, kEffectSlots> pbufferefx;
-    std::atomic<int> nsendbuffers{0};  // how many of them exist: the audio thread uses no more
     // Echo lines by echo instance, 4 x length + 1024 bytes, and their sizes in bytes;
     // replaced under the structure lock, run by the echo unit on the audio thread.
     std::array<std::unique_ptr<float[]>, kEchoUnits> echoefx;
     std::array<uint32_t, kEchoUnits> sizeecho{};
 
-    // Gives buffer number slot the next serial number unless it has one.
-    void number_buffer(int slot);
-    void clear_numbering();
-    // Makes sure send buffers 0 .. count - 1 exist; returns false if memory ran out.
-    bool reserve_send_buffers(int count);
     // Makes echo unit's line hold length frames (4 x length + 1024 bytes); the new line
     // is swapped in under lock, since the audio thread may be running the old one.
     bool reserve_echo_line(int unit, uint32_t length, StructureLock& lock);

@@ -95,16 +95,8 @@ TEST_F(LoaderTest, MultipleMusicLoadingAddsASong) {
     EXPECT_EQ(bank.pattern(0)->col[0][0].note, 42);  // the first song's own pattern stays
 }
 
-TEST_F(LoaderTest, EffectBuffersAreNumberedAndReserved) {
-    slots.number_buffer(40);  // a numbering from an earlier song is cleared
+TEST_F(LoaderTest, TheFilesEffectUnitsAreInstalled) {
     ASSERT_TRUE(load(copy_of("otm-new-layout.otm", "fx.otm"), bank, slots).ok);
-    EXPECT_EQ(slots.nbbufferefx, 3);
-    EXPECT_EQ(slots.bufnumber[12], 1);
-    EXPECT_EQ(slots.bufnumber[5], 2);
-    EXPECT_EQ(slots.bufnumber[7], 3);
-    EXPECT_EQ(slots.bufnumber[40], 0);
-    for (int k = 0; k < 3; ++k) EXPECT_NE(slots.pbufferefx[k], nullptr) << k;
-    EXPECT_EQ(slots.pbufferefx[3], nullptr);
     EXPECT_EQ(slots.efxtype[21], 11);  // the file's added units
     EXPECT_EQ(slots.sizeecho[2], 4u * 3000 + 1024);
 }

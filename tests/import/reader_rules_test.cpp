@@ -31,9 +31,6 @@ TEST(ReaderRules, NativeFieldsAndEffectFactsOutsideTheReport) {
     EXPECT_EQ(m.patmark[1][2].position, 10);
     EXPECT_EQ(m.patmark[1][2].value, -10);
     EXPECT_EQ(m.efxval[7], 70u);
-    // Effect buffers named by command 33 in the patterns, then by the tracks' routing.
-    EXPECT_EQ(r.effects.numbered_slots, (std::vector<int>{12, 5, 12, 7}));
-    EXPECT_TRUE(r.effects.renumber);
     EXPECT_EQ(r.effects.echo_units_set, 7u);
     ASSERT_TRUE(r.effects.has_added_types);
     EXPECT_EQ(r.effects.added_types[3], 0);  // fixed slots are not taken from the file

@@ -182,16 +182,16 @@ TEST_F(Commands, SampleBlocks) {
 }
 
 TEST_F(Commands, EffectSlotRoutingAndSendLevels) {
-    engine.slots.reserve_send_buffers(1);
     put(0, 0, 0, 0, 0, 33, 11);  // echo: has a type
     put(0, 0, 1, 0, 0, 33, 4);   // no unit in slot 4: nothing
-    put(0, 0, 2, 0, 0, 33, 12);  // a second slot, but only one send buffer: nothing
+    put(0, 0, 2, 0, 0, 33, 12);  // a second slot: its send buffer exists, so it is routed
     play();
     calls(1);
     EXPECT_EQ(song().tracke[0], 11);
     EXPECT_EQ(player.efxaffiche[0], 11);
     EXPECT_EQ(song().tracke[1], 0);
-    EXPECT_EQ(song().tracke[2], 0);
+    EXPECT_EQ(song().tracke[2], 12);
+    EXPECT_EQ(player.efxaffiche[2], 12);
     song().tracke[3] = 11;
     put(0, 1, 0, 0, 0, 34, 77);
     put(0, 1, 1, 0, 0, 33, 0);

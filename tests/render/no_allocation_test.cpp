@@ -55,7 +55,6 @@ TEST_F(NoAllocation, BufferProcAllocatesNothingWhilePlaying) {
     TMOD& m = song();
     m.nbtrack = kTracksUsed;
     engine.bank.updatenbvoice(kTracksUsed);
-    engine.slots.reserve_send_buffers(kEffectSlots);
     for (int t = 0; t < 10; ++t) m.tracke[t] = static_cast<uint16_t>(kUnits[t]);
     m.efxflag[11] = 1;
     p_s& a = sample8(1, std::vector<int8_t>(5000, 40));
