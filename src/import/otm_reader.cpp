@@ -377,10 +377,6 @@ void chunk_patt(OtmState& st, ByteReader& b) {
     st.out.song.patterns[number] = std::move(p);
 }
 
-int16_t effect_type_from_file(uint16_t type) {
-    return is_basic_effect_type(type) ? static_cast<int16_t>(type) : 0;
-}
-
 void chunk_efx(OtmState& st, ByteReader& b) {
     TMOD& m = st.m;
     b.skip(2);
@@ -398,7 +394,9 @@ void chunk_efx(OtmState& st, ByteReader& b) {
     if (!read_words(b, types, kEffectSlots, true)) return;
     EffectsRead& fx = st.out.effects;
     fx.has_added_types = true;
-    for (int s = kFirstClonedSlot; s < kEffectSlots; ++s) fx.added_types[s] = effect_type_from_file(types[s]);
+    // A type no unit knows is kept as it is: it is listed under its number, routed, saved
+    // back, and run by nothing.
+    for (int s = kFirstClonedSlot; s < kEffectSlots; ++s) fx.added_types[s] = static_cast<int16_t>(types[s]);
     const int units = std::min<int>(b.u16le(), kEchoUnits);
     for (int u = 1; u < units; ++u) {
         const uint32_t ulen = b.u32le();

@@ -16,12 +16,6 @@ EffectSlots::EffectSlots() {
     for (auto& buffer : pbufferefx) buffer = std::make_unique<float[]>(kSendBufferFloats);
 }
 
-bool is_basic_effect_type(int type) {
-    for (int t : kBasicTypes)
-        if (t == type) return true;
-    return false;
-}
-
 bool EffectSlots::reserve_echo_line(int unit, uint32_t length, StructureLock& lock) {
     if (unit < 0 || unit >= kEchoUnits) return false;
     length = std::min(length, kMaxEchoFrames);

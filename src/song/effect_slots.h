@@ -22,7 +22,8 @@ struct EffectSlots {
 
     // Unit type of each slot 0..99 (1, 2, 3, 5, 9, 10, 11, 12, 16, 17; 0 = none): slots 1..19
     // hold the basic units at their own number, 20..99 the clones ("Clone efx", the "efx."
-    // chunk); written by the rack and the native reader, read by the mixer and command 33.
+    // chunk, which may bring other numbers: kept and routed, but run by no unit); written by
+    // the rack and the native reader, read by the mixer and command 33.
     std::array<int16_t, kEffectSlots> efxtype{};
     // Send buffers by compact number - 1, 20480 bytes (kSendBufferFloats floats) each, all
     // made with the slots, so that routing never waits on memory; the mixer sums the voices
@@ -38,7 +39,6 @@ struct EffectSlots {
     bool reserve_echo_line(int unit, uint32_t length, StructureLock& lock);
 };
 
-bool is_basic_effect_type(int type);
 // Label of a slot in the menu of added effects, e.g. "(21) Echo, Delay".
 std::string added_effect_label(int slot, int type);
 

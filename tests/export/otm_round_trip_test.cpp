@@ -50,6 +50,8 @@ void fill_song(SongBank& bank, EffectSlots& slots, unsigned seed) {
     slots.efxtype[21] = 11;
     slots.efxtype[30] = 16;
     slots.efxtype[99] = 1;
+    slots.efxtype[40] = 6;   // types no unit knows, 0xFFFF among them
+    slots.efxtype[41] = -1;
 
     const int rows[] = {64, 1, 200, 128};
     for (int p = 0; p < 4; ++p) {
@@ -116,6 +118,9 @@ TEST(OtmRoundTrip, EveryFieldTheReaderReadsComesBack) {
                   original.song_pattern(2)->col[9][199].parameter);
         EXPECT_EQ(loaded.song_sample(64)->data[3999], original.song_sample(64)->data[3999]);
         EXPECT_EQ(loaded.song_sample(1), nullptr);
+        // A type no unit knows is kept, listed under its number alone.
+        EXPECT_EQ(loaded_slots.efxtype[41], -1);
+        EXPECT_EQ(added_effect_label(41, loaded_slots.efxtype[41]), "(41)");
     }
 }
 

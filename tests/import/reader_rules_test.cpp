@@ -36,7 +36,7 @@ TEST(ReaderRules, NativeFieldsAndEffectFactsOutsideTheReport) {
     EXPECT_EQ(r.effects.added_types[3], 0);  // fixed slots are not taken from the file
     EXPECT_EQ(r.effects.added_types[21], 11);
     EXPECT_EQ(r.effects.added_types[22], 16);
-    EXPECT_EQ(r.effects.added_types[23], 0);  // no such unit
+    EXPECT_EQ(r.effects.added_types[23], 999);  // no such unit: kept all the same
 
     const ModuleRead short_chunk = read(read_otm, format_case("otm-mixed-layouts.otm"));
     EXPECT_EQ(short_chunk.effects.echo_units_set, 1u);
