@@ -55,7 +55,7 @@ void write_sample(ByteWriter& w, int number, const p_s& s) {
     w.u16le(static_cast<uint16_t>(s.refnote));
     w.u8(s.stereo);
     w.u8(s.flag2);
-    w.u16le(static_cast<uint16_t>(s.loopon));
+    w.u16le(s.loopon);
     w.u16le(static_cast<uint16_t>(s.volume));
     w.u16le(static_cast<uint16_t>(s.level));
     w.u16le(static_cast<uint16_t>(s.finetune));

@@ -327,7 +327,7 @@ void chunk_inst(OtmState& st, ByteReader& b) {
     s->refnote = static_cast<int16_t>(refnote);
     s->stereo = stereo;
     s->flag2 = flag2;
-    s->loopon = static_cast<int16_t>(loopon);
+    s->loopon = loopon;
     s->volume = static_cast<int16_t>(volume);
     s->level = static_cast<int16_t>(level);
     s->finetune = static_cast<int16_t>(finetune);

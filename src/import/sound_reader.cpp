@@ -60,7 +60,7 @@ bool read_avr(ByteReader& file, SampleRef& out) {
     }
     s->stereo = h[13] > 1;
     s->bits = h[15];
-    s->loopon = static_cast<int16_t>(h[18] << 8 | h[19]);
+    s->loopon = static_cast<uint16_t>(h[18] << 8 | h[19]);
     s->refnote = h[21];
     s->rate = static_cast<uint32_t>(h[24] << 8 | h[25]);
     const uint32_t loop_start = (uint32_t{h[31]} << 16 | uint32_t{h[32]} << 8 | h[33]) & ~1u;

@@ -21,7 +21,7 @@ struct p_s {
     uint32_t length;     // data length in bytes
     uint32_t loopstart;  // loop start in bytes
     uint32_t loopend;    // loop end in bytes; the mixer loops from loopstart to here
-    int16_t loopon;      // non-zero: the data loops between loopstart and loopend; 0
+    uint16_t loopon;     // non-zero: the data loops between loopstart and loopend; 0
     int16_t refnote;     // note (index of floatnote) that plays the data at its own rate; 72
     uint8_t spare[4];    // unused, kept for the record's layout
     char name[32];       // the sound's name, NUL-terminated; "None" when a file gives none

@@ -80,7 +80,7 @@ void fill_song(SongBank& bank, EffectSlots& slots, unsigned seed) {
         s->rate = static_cast<uint32_t>(any(4000, 96000));
         s->loopstart = length_of[i] / 4;
         s->loopend = length_of[i] / 2;
-        s->loopon = static_cast<int16_t>(i & 1);
+        s->loopon = static_cast<uint16_t>(i & 1);
         s->refnote = static_cast<int16_t>(any(0, 127));
         s->volume = static_cast<int16_t>(any(0, 128));
         s->level = static_cast<int16_t>(any(0, 128));
