@@ -90,6 +90,7 @@ void read_sample(ByteReader& file, const uint8_t* h, ModuleRead& out, int index)
 }  // namespace
 
 bool read_mod(ByteReader& file, ModuleRead& out) {
+    // Shorter than the smallest header, a file would load as an empty song: refused instead.
     if (file.size() < kHeader15) {
         out.error = "too short to be a module (" + std::to_string(file.size()) + " bytes)";
         return false;

@@ -67,6 +67,7 @@ void read_sample(ByteReader& file, const uint8_t* h, ModuleRead& out, int index)
 
 bool read_mtm(ByteReader& file, ModuleRead& out) {
     uint8_t head[66] = {};
+    // Without its mark the file could only be read as garbage: refused, the song kept.
     if (file.read(head, sizeof head) < sizeof head || std::memcmp(head, "MTM", 3) != 0) {
         out.error = "not a MultiTracker module (no MTM mark)";
         return false;

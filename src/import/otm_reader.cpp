@@ -336,7 +336,7 @@ void chunk_inst(OtmState& st, ByteReader& b) {
     for (int k = 0; k < kEnvelopeKinds; ++k)
         for (int j = 0; j < kEnvelopePoints; ++j) s->env(k, j) = env[k * kEnvelopePoints + j];
     s->setting = setting;
-    bound_sample(*s);
+    bound_sample(*s);  // the frame shift from bits and channels: 1 for 8-bit stereo here too
     st.out.song.samples[number] = std::move(s);
 }
 
@@ -471,6 +471,7 @@ bool read_otm(ByteReader& file, ModuleRead& out) {
         }
     }
     if (got > 0 && got < 8) out.truncated = true;
+    // Nothing known to read means the file is not a module: refused, not loaded as empty.
     if (chunks == 0) {
         out.error = "not an Ondrel Tracker module (no known chunk at its start)";
         return false;

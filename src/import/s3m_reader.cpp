@@ -156,7 +156,7 @@ void read_sample(ByteReader& file, const uint8_t* h, bool unsigned_data, ModuleR
     s->bits = bits16 ? 16 : 8;
     s->stereo = stereo;
     s->volume = static_cast<int16_t>(volume * 2);
-    s->refnote = 48;
+    s->refnote = 48;  // C-4 (byte 64) plays the data at its own rate, as for MOD samples
     if (length) {
         std::vector<uint8_t> raw(length);
         file.seek(data_at);
@@ -199,6 +199,7 @@ bool read_s3m(ByteReader& file, ModuleRead& out) {
         out.error = "too short to be a Scream Tracker module";
         return false;
     }
+    // Without its mark the file could only be read as garbage: refused, the song kept.
     if (std::memcmp(head + 44, "SCRM", 4) != 0) {
         out.error = "not a Scream Tracker module (no SCRM mark)";
         return false;

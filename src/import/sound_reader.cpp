@@ -133,6 +133,7 @@ bool read_wav(ByteReader& file, SampleRef& out, std::string& why) {
     const int channels = fmt[2];
     const uint32_t rate = static_cast<uint32_t>(fmt[4] | fmt[5] << 8);  // only 16 bits are taken
     const int bits = fmt[14];
+    // Other sizes would play as noise: refused, the slot keeps its sound.
     if (bits != 8 && bits != 16) {
         why = std::to_string(bits) + "-bit sound files are not read; save it with 8 or 16 bits";
         return false;
