@@ -18,6 +18,8 @@ void cmd_save_song_as(Program& p, const ShellMessage& m);
 void cmd_save_song_to(Program& p, const ShellMessage& m);
 void cmd_save_sound(Program& p, const ShellMessage& m);
 void cmd_save_sound_to(Program& p, const ShellMessage& m);
+void cmd_save_midi(Program& p, const ShellMessage& m);
+void cmd_save_midi_to(Program& p, const ShellMessage& m);
 void cmd_quit(Program& p, const ShellMessage& m);
 // Saves the current song to its file, or asks for one; then runs next.
 void save_song_then(Program& p, const std::function<void()>& next);

@@ -1,12 +1,15 @@
 // Opening and saving: the file panel's commands, dropped files, files named at start-up.
+#include <cstdio>
 #include <filesystem>
 #include <memory>
 
+#include "export/midi_file.h"
 #include "export/otm_writer.h"
 #include "export/sound_wav_writer.h"
 #include "import/loader.h"
 #include "import/sound_reader.h"
 #include "platform/mime_type.h"
+#include "render/midi_export.h"
 #include "shell/command_handlers.h"
 #include "shell/program.h"
 
@@ -30,15 +33,21 @@ bool saves_in_place(const TMOD& song) {
     return song.path[0] && same_nocase(extension_of(song.path), ".otm");
 }
 
-std::string proposed_song_name(const TMOD& song) {
-    if (song.path[0]) return fs::path(song.path).stem().string() + ".otm";
-    if (song.name[0]) return std::string(song.name) + ".otm";
-    return "Untitled.otm";
+// The name a save panel proposes for a file made from the song.
+std::string proposed_name(const TMOD& song, const char* extension) {
+    if (song.path[0]) return fs::path(song.path).stem().string() + extension;
+    if (song.name[0]) return std::string(song.name) + extension;
+    return std::string("Untitled") + extension;
 }
 
 std::string directory_of(const std::string& path) {
     const fs::path parent = fs::path(path).parent_path();
     return parent.empty() ? fs::current_path().string() : parent.string();
+}
+
+// A name typed without an extension gets the file kind's.
+std::string with_extension(const std::string& path, const char* extension) {
+    return extension_of(fs::path(path).filename().string()).empty() ? path + extension : path;
 }
 
 void tell_failure(Program& p, const std::string& why) {
@@ -120,13 +129,18 @@ bool save_current_song(Program& p, const std::string& path) {
     return true;
 }
 
-void ask_where_to_save(Program& p, const std::function<void()>& next) {
+// A save panel for a file made from the current song, beside the song's file.
+void ask_where_to_save_song_as(Program& p, uint32_t reply_code, const char* title, const char* extension) {
     const TMOD& song = p.engine.bank.current();
     p.file_panel.mode = FilePanelRequest::Mode::Save;
-    p.file_panel.reply_code = fourcc("SAvt");
-    p.file_panel.title = "Save as...";
+    p.file_panel.reply_code = reply_code;
+    p.file_panel.title = title;
     p.file_panel.directory = song.path[0] ? directory_of(song.path) : p.browser_directory();
-    p.file_panel.suggested_name = proposed_song_name(song);
+    p.file_panel.suggested_name = proposed_name(song, extension);
+}
+
+void ask_where_to_save(Program& p, const std::function<void()>& next) {
+    ask_where_to_save_song_as(p, fourcc("SAvt"), "Save as...", ".otm");
     p.file_panel.after = next;
 }
 
@@ -176,9 +190,7 @@ void cmd_save_song_as(Program& p, const ShellMessage&) {
 
 void cmd_save_song_to(Program& p, const ShellMessage& m) {
     if (m.refs.empty()) return;
-    std::string path = m.refs.front();
-    if (extension_of(fs::path(path).filename().string()).empty()) path += ".otm";
-    if (save_current_song(p, path)) p.run_after_file();
+    if (save_current_song(p, with_extension(m.refs.front(), ".otm"))) p.run_after_file();
 }
 
 void cmd_save_sound(Program& p, const ShellMessage&) {
@@ -202,6 +214,27 @@ void cmd_save_sound_to(Program& p, const ShellMessage& m) {
         return;
     }
     p.say("Saved " + m.refs.front());
+    p.run_after_file();
+}
+
+void cmd_save_midi(Program& p, const ShellMessage&) {
+    ask_where_to_save_song_as(p, fourcc("SMvt"), "Save as Midifile", ".mid");
+}
+
+void cmd_save_midi_to(Program& p, const ShellMessage& m) {
+    if (m.refs.empty()) return;
+    const std::string path = with_extension(m.refs.front(), ".mid");
+    const MidiExport exported = song_to_midi(p.engine, {});
+    std::string why;
+    if (!save_midi_file(path, exported.file, why)) {
+        tell_failure(p, why);
+        return;
+    }
+    const int seconds = static_cast<int>(exported.seconds);
+    char length[16];
+    std::snprintf(length, sizeof length, "%d:%02d", seconds / 60, seconds % 60);
+    p.say("Saved " + path + " (" + length +
+          " of song, tracks with notes: " + std::to_string(exported.file.tracks.size()) + ")");
     p.run_after_file();
 }
 

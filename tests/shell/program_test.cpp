@@ -107,6 +107,20 @@ TEST_F(ProgramTest, SavingAForeignSongAsksForANativeFileAndKeepsTheOriginal) {
     EXPECT_EQ(again.engine.bank.song_pattern(again.engine.bank.current().sequence[0])->col[0][0].note, 49);
 }
 
+TEST_F(ProgramTest, SaveAsMidifileProposesTheSongsNameBesideItAndSaysWhatItWrote) {
+    open({kModule});
+    run("SAvm");
+    EXPECT_EQ(p.file_panel.directory + "/" + p.file_panel.suggested_name, "../shared/corpus/mod/TDZ3.mid");
+    p.file_chosen(dir.file("tune"));
+    p.run_pending();
+    EXPECT_EQ(test::read_all(dir.file("tune.mid")).at(13), 0xC0);  // 960 ticks a quarter note
+    EXPECT_EQ(p.last_said().rfind("Saved " + dir.file("tune.mid") + " (", 0), 0u) << p.last_said();
+    run("SAvm");
+    p.file_chosen(dir.file("missing/tune.mid"));
+    p.run_pending();
+    EXPECT_EQ(front_text(), p.last_said());  // an alert says why it could not be written
+}
+
 TEST_F(ProgramTest, UnsavedChangesAreAskedAboutBeforeTheyAreLost) {
     change_a_cell();
     run("news");
