@@ -67,6 +67,8 @@ int cmd_play(const Args& args) {
     Engine engine;
     if (!load_for_cli(engine, in)) return kExitFailed;
     apply_sound_options(sound, engine);
+    MidiSetup midi(engine);
+    if (!start_midi_synth(sound, midi)) return kExitFailed;
     Player& player = engine.player;
     player.tr.floop = loop;
     player.watch_for_repeats(!loop);

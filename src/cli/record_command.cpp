@@ -184,6 +184,8 @@ int record_song(const RecordOptions& o) {
     Engine engine;
     if (!load_for_cli(engine, o.song)) return kExitFailed;
     apply_sound_options(o.sound, engine);
+    MidiSetup midi(engine);
+    if (!start_midi_synth(o.sound, midi)) return kExitFailed;
     Recorder recorder(engine.mixer, &engine.alert_log, nullptr, notes_stream(o));
     const RecordFormat& f = record_format(o.mode);
     SongEndWatch watch(recorder, engine.player, engine.mixer, f.block_align);

@@ -43,6 +43,8 @@ int cmd_render(const Args& args) {
     const bool quiet = parsed.quiet;
     Engine engine;
     if (!load_song_with_options(parsed, engine)) return kExitFailed;
+    MidiSetup midi(engine);
+    if (!start_midi_synth(parsed.sound, midi)) return kExitFailed;
     WavWriter wav;
     std::string why;
     if (!wav.open(out, 2, 44100, as_float ? WavSampleFormat::Float32 : WavSampleFormat::Pcm16, why)) {

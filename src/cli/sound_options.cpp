@@ -1,6 +1,7 @@
 #include "cli/sound_options.h"
 
 #include <cstdlib>
+#include <iostream>
 #include <sstream>
 
 namespace ondrel {
@@ -25,7 +26,9 @@ const char* sound_options_help() {
            "  --master N           master volume, 0 to 256 (64 = unity; default: the song's)\n"
            "  --mute LIST          tracks to mute, e.g. 1,3,4\n"
            "  --max-seconds S      stop after S seconds\n"
-           "  --buffer FRAMES      frames per buffer, 64 to 4096 (default 1024)\n";
+           "  --buffer FRAMES      frames per buffer, 64 to 4096 (default 1024)\n"
+           "  --midi-synth [SF2]   tracks with a MIDI channel play on the internal General MIDI\n"
+           "                       synthesiser (with the SoundFont SF2, else the system's)\n";
 }
 
 bool parse_sound_option(const std::vector<std::string>& args, size_t& i, SoundOptions& o,
@@ -40,6 +43,14 @@ bool parse_sound_option(const std::vector<std::string>& args, size_t& i, SoundOp
         return true;
     };
     std::string v;
+    if (a == "--midi-synth") {
+        o.midi_synth = true;
+        const auto sf = [](const std::string& s) {
+            return s.size() > 4 && (s.ends_with(".sf2") || s.ends_with(".SF2") || s.ends_with(".sf3"));
+        };
+        if (i + 1 < args.size() && sf(args[i + 1])) o.soundfont = args[++i];
+        return true;
+    }
     if (a == "--no-tempo") {
         o.tick_accurate = false;
         return true;
@@ -105,6 +116,15 @@ void apply_sound_options(const SoundOptions& o, Engine& engine) {
     engine.mixer.valpitch = static_cast<int16_t>(o.pitch);
     for (auto& m_ : engine.mixer.mute) m_ = 0;
     for (int t : o.muted) engine.mixer.mute[t - 1] = 1;
+}
+
+bool start_midi_synth(const SoundOptions& o, MidiSetup& midi) {
+    if (!o.midi_synth) return true;
+    midi.soundfont = o.soundfont;
+    std::string why;
+    if (midi.open_synth(why, false)) return true;
+    std::cerr << "ondrel: cannot start the MIDI synthesiser: " << why << "\n";
+    return false;
 }
 
 }  // namespace ondrel

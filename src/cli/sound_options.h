@@ -3,6 +3,7 @@
 #include <vector>
 
 #include "engine/engine.h"
+#include "shell/midi_setup.h"
 
 namespace ondrel {
 
@@ -17,6 +18,8 @@ struct SoundOptions {
     std::vector<int> muted;  // 1-based tracks
     double max_seconds = 0;
     int buffer_frames = 1024;
+    bool midi_synth = false;  // tracks with a MIDI channel sound through the internal synthesiser
+    std::string soundfont;    // its SoundFont; empty: the system's General MIDI one
 };
 
 // Takes the option at args[i] (and its value) if it is one of ours; false otherwise.
@@ -26,5 +29,8 @@ bool parse_sound_option(const std::vector<std::string>& args, size_t& i, SoundOp
 const char* sound_options_help();
 // Applies them to a loaded song and the mixer.
 void apply_sound_options(const SoundOptions& o, Engine& engine);
+// Opens the internal synthesiser when the options ask for it (for as long as midi lives);
+// false, said on stderr, when it cannot be had.
+bool start_midi_synth(const SoundOptions& o, MidiSetup& midi);
 
 }  // namespace ondrel

@@ -37,6 +37,8 @@ int cmd_spectrogram(const Args& args) {
     const bool quiet = parsed.quiet;
     Engine engine;
     if (!load_song_with_options(parsed, engine)) return kExitFailed;
+    MidiSetup midi(engine);
+    if (!start_midi_synth(parsed.sound, midi)) return kExitFailed;
     // The mixer fills the analyser block from the song; a row is drawn each time 75 ms of
     // the song have been rendered, from the block as the window would find it then.
     engine.mixer.f_fftmode = 1;

@@ -1,6 +1,7 @@
 #include "platform/midi_ports.h"
 
 #include <rtmidi/RtMidi.h>
+#include <unistd.h>
 
 #include <chrono>
 #include <cstdlib>
@@ -41,6 +42,12 @@ int index_of(Port* port, const std::string& name) {
 MidiPorts::MidiPorts(MidiRouter& router) : router_(router) {
     const RtMidi::Api api = chosen_api();
     api_ = api;
+    // Asked without a sequencer device, ALSA and RtMidi each print their own complaint:
+    // look first, and say it once.
+    if (api == RtMidi::LINUX_ALSA && access("/dev/snd/seq", R_OK | W_OK) != 0) {
+        why_ = "no ALSA sequencer (/dev/snd/seq)";
+        return;
+    }
     try {
         probe_in_ = std::make_unique<RtMidiIn>(api, "Ondrel Tracker");
         probe_out_ = std::make_unique<RtMidiOut>(api, "Ondrel Tracker");

@@ -47,6 +47,7 @@ public:
     std::array<int16_t, kTracks> efxaffiche{};    // slot shown on each track's effect button (command 33)
     std::array<int16_t, kEffectSlots> autovar{};  // the mixer's auto-pan positions, 0..255; efxa at start
     std::atomic<MidiOut*> papi{nullptr};          // the open MIDI output, null when none
+    uint64_t step_frame = 0;  // the mixer's frame count where the current step starts (audio thread)
     SpscQueue<64> to_window;                      // messages from the audio thread ('stop')
     std::vector<Message> window_posts;            // messages from the window thread itself ('acti')
     const char* status = kStatusStopped;          // the status line

@@ -69,7 +69,9 @@ void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
     const double frame_rate = format.frame_rate > 0 ? format.frame_rate : kOutputRate;
     int c = 0;
     bool silent = true;  // no voice has been heard in this call yet
+    SynthSource* const synth = synth_.load(std::memory_order_acquire);
     while (c < frames) {
+        player_.step_frame = frames_rendered_ + static_cast<uint64_t>(c);
         int n;
         if (ftemp.load(std::memory_order_relaxed)) {
             if (bpmreste < 1.0) {
@@ -91,8 +93,11 @@ void Mixer::render_call(float* out, int frames, const AudioFormat& format) {
         }
         render_piece(out, c, n, m, frame_rate);
         silent = silent && !piece_has_setter_;
+        // The synthesiser's notes were sent by the step above: they sound from here on.
+        if (synth && synth->render_add(out + 2 * c, n)) silent = false;
         c += n;
     }
+    frames_rendered_ += static_cast<uint64_t>(frames);
     // A buffer of zeros needs no clipping and has no peak: a stopped or silent stretch
     // of a song costs little more than clearing its buffer.
     silent = !effect_stage(out, frames, m) && silent;

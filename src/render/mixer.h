@@ -47,6 +47,13 @@ public:
     void set_recorder(OutputRecorder* recorder) { recorder_ = recorder; }
     void set_monitor(MonitorRing* ring) { monitor_ring_ = ring; }
     void set_preview(SoundPreview* preview) { preview_ = preview; }
+    // The synthesiser may be swapped while the callback runs; the old one must outlive
+    // the callback in progress (the caller takes the structure lock before freeing it).
+    void set_synth(SynthSource* synth) { synth_.store(synth, std::memory_order_release); }
+    SynthSource* synth() const { return synth_.load(std::memory_order_acquire); }
+
+    // Frames rendered since the mixer was made: the clock of the sequencer's steps.
+    uint64_t frames_rendered() const { return frames_rendered_; }
 
     // The callback: fills size bytes of interleaved stereo float at buffer.
     void BufferProc(void* cookie, void* buffer, unsigned long size, const AudioFormat& format);
@@ -85,6 +92,8 @@ private:
     OutputRecorder* recorder_ = nullptr;
     MonitorRing* monitor_ring_ = nullptr;
     SoundPreview* preview_ = nullptr;
+    std::atomic<SynthSource*> synth_{nullptr};
+    uint64_t frames_rendered_ = 0;  // audio thread
 
     // Per piece: the control value of each slot, its compact number, and whether a voice
     // has written its send buffer yet.

@@ -16,6 +16,15 @@ public:
     virtual void RecordFile(const int16_t* samples, size_t bytes, const AudioFormat& format) = 0;
 };
 
+// A synthesiser played by the song's MIDI tracks, rendered with the song: the mixer asks
+// it for each piece right after the sequencer step that may have sent it notes.
+class SynthSource {
+public:
+    virtual ~SynthSource() = default;
+    // Audio thread: adds frames of stereo output into out; false when it added nothing.
+    virtual bool render_add(float* out, int frames) = 0;
+};
+
 // The monitored input: a ring of 16384 bytes of 16-bit stereo frames filled by the capture
 // side and read by the mixer at its own pace.
 struct MonitorRing {

@@ -132,6 +132,19 @@ bool recording_idle(const Program& p);
 // The "FFT Window": opening it, its source and view menus.
 void cmd_analyser(Program& p, const ShellMessage& m);
 
+// MIDI: the internal synthesiser and its SoundFont, the ports, notes from the input.
+void cmd_internal_synth(Program& p, const ShellMessage& m);
+void cmd_choose_soundfont(Program& p, const ShellMessage& m);
+void cmd_soundfont_chosen(Program& p, const ShellMessage& m);
+void cmd_midi_port(Program& p, const ShellMessage& m);
+void cmd_midi_port_lost(Program& p, const ShellMessage& m);
+void cmd_midi_note(Program& p, const ShellMessage& m);
+bool internal_synth_open(const Program& p);
+// The editor's two MIDI range fields: the names of note - 36 (not below 0) and of that
+// value + 60 (not above 127).
+struct EditorState;
+void setnoteg(EditorState& editor, short note);
+
 // Searches.
 void cmd_find_next(Program& p, const ShellMessage& m);
 void cmd_replace_all(Program& p, const ShellMessage& m);

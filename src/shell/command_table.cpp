@@ -148,6 +148,10 @@ const CommandInfo kCommands[] = {
     {fourcc("AMIG"), "Amiga", Menu::Options, nullptr, kNoKey, cmd_keyboard_layout, nullptr,
      [](const Program& p) { return p.editor.layout == KeyboardLayout::Amiga; }},
     // MIDI
+    {fourcc("MSYN"), "Internal Midi Synth", Menu::Midi, nullptr, kNoKey, cmd_internal_synth, nullptr,
+     internal_synth_open},
+    {fourcc("MSF2"), "Choose SoundFont...", Menu::Midi, nullptr, kNoKey, cmd_choose_soundfont},
+    {fourcc("MPRT"), "Midi Ports...", Menu::Midi, nullptr, kNoKey, cmd_open_window},
     {fourcc("SMch"), "Set Midi chanel", Menu::Midi, nullptr, kNoKey, cmd_open_window},
     // The transport buttons and keys
     {fourcc("PLsg"), "Play Song", Menu::None, nullptr, plain(kKeyF1 + 4), cmd_play_song},
@@ -184,7 +188,11 @@ const CommandInfo kCommands[] = {
     {fourcc("stop"), "Song ended", Menu::None, nullptr, kNoKey, cmd_song_ended},
     {fourcc("acti"), "Play started or stopped", Menu::None, nullptr, kNoKey, cmd_arrangement_follow},
     {fourcc("doup"), "Cursor jumped", Menu::None, nullptr, kNoKey, cmd_arrangement_follow},
-    {fourcc("midi"), "MIDI note", Menu::None, nullptr, kNoKey, nullptr},
+    {fourcc("midi"), "MIDI note", Menu::None, nullptr, kNoKey, cmd_midi_note},
+    {fourcc("MLST"), "MIDI output lost", Menu::None, nullptr, kNoKey, cmd_midi_port_lost},
+    {fourcc("MSFt"), "SoundFont chosen", Menu::None, nullptr, kNoKey, cmd_soundfont_chosen},
+    {fourcc("MOsl"), "Choose MIDI output", Menu::None, nullptr, kNoKey, cmd_midi_port},
+    {fourcc("MIsl"), "Choose MIDI input", Menu::None, nullptr, kNoKey, cmd_midi_port},
     {fourcc("moni"), "Monitor", Menu::None, nullptr, kNoKey, cmd_monitor, can_monitor},
     {fourcc("reco"), "Record", Menu::None, nullptr, kNoKey, cmd_record, can_record},
     {fourcc("stre"), "Stop recording", Menu::None, nullptr, kNoKey, cmd_stop_recording, can_stop_recording},

@@ -177,6 +177,11 @@ void editor_key_down(Program& p, const KeyChord& chord, bool repeat) {
     }
 }
 
+void enter_note_at_cursor(Program& p, int note) {
+    // A MIDI key is never a digit: it enters its note whatever field the cursor is on.
+    enter_note(p, note);
+}
+
 void editor_key_up(Program& p, const KeyChord& chord) {
     if (!piano_note(p.editor.layout, chord.key, p.editor.octave)) return;
     ChordEntry& c = p.editor.chord;

@@ -1,4 +1,5 @@
 #pragma once
+#include <array>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -53,6 +54,8 @@ struct SearchState {
 struct EditorState {
     bool edit_mode = false;  // Space toggles; notes are written only while it is on
     int octave = 3;          // base octave of the computer keyboard's piano
+    // The five octaves around the last note from a MIDI keyboard (setnoteg), as shown.
+    std::array<char, 5> midi_range_low{}, midi_range_high{};
     KeyboardLayout layout = KeyboardLayout::Amiga;
     int16_t view_top = 0;  // first row shown ("on_y")
     int16_t oftrack = 0;   // first track shown

@@ -11,7 +11,7 @@
 namespace ondrel {
 
 Program::Program()
-    : engine(&alerts), recording(engine.mixer, &alerts, home_directory()), paths(home_directory()) {
+    : engine(&alerts), recording(engine.mixer, &alerts, home_directory()), midi(engine), paths(home_directory()) {
     histories_.resize(static_cast<size_t>(engine.bank.nbimod));
 }
 
@@ -22,6 +22,7 @@ void Program::post(ShellMessage message) {
 void Program::take_engine_messages() {
     Message m;
     while (engine.player.to_window.pop(m)) post(ShellMessage(m.code).with("note", m.a).with("vel", m.b));
+    while (midi.poll(m)) post(ShellMessage(m.code).with("note", m.a).with("vel", m.b));
     auto posts = std::move(engine.player.window_posts);
     engine.player.window_posts.clear();
     for (const Message& p : posts) post(ShellMessage(p.code));

@@ -16,6 +16,7 @@
 #include "shell/file_browser.h"
 #include "shell/file_panel_request.h"
 #include "shell/keys.h"
+#include "shell/midi_setup.h"
 #include "shell/path_settings.h"
 #include "shell/recording.h"
 #include "shell/shell_message.h"
@@ -39,6 +40,7 @@ public:
     FilePanelRequest file_panel;  // the file panel to show, if any
     Recording recording;          // the recorder, its input and the recording panel's choices
     AnalyserView analyser;        // what the "FFT Window" shows
+    MidiSetup midi;               // the synthesiser, the ports, notes from a MIDI keyboard
 
     // Commands. post() queues; run_pending() handles what the queues hold, in order,
     // after taking in what the audio thread and the other threads sent.

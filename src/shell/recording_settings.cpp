@@ -7,6 +7,7 @@
 
 #include "export/output_file.h"
 #include "shell/recording.h"
+#include "shell/settings_lines.h"
 
 namespace ondrel {
 
@@ -16,14 +17,6 @@ constexpr const char* kDirectoryKey = "<Record Path>";
 constexpr const char* kInputKey = "<Record Input>";
 constexpr const char* kFormatKey = "<Record Format>";
 constexpr const char* kGainKey = "<Record Gain>";
-
-// The value of a line that starts with key, or false.
-bool value_of(const std::string& line, const char* key, std::string& value) {
-    const std::string k = key;
-    if (line.compare(0, k.size(), k) != 0) return false;
-    value = line.substr(k.size());
-    return true;
-}
 
 // A whole number in [low, high], or false.
 bool number_in(const std::string& text, long low, long high, long& out) {
@@ -64,14 +57,7 @@ bool write_recording_settings(const Recording& recording, const std::string& the
     if (recording.has_input()) text += kInputKey + recording.chosen_input_name() + "\n";
     text += kFormatKey + std::to_string(recording.recorder.samplermode.load()) + "\n";
     text += kGainKey + std::to_string(recording.recorder.vrvol.load()) + "\n";
-    std::error_code ec;
-    std::filesystem::create_directories(thepath, ec);
-    if (ec) {
-        why = "cannot create " + thepath + ": " + ec.message();
-        return false;
-    }
-    return write_output_file(recording_settings_file(thepath), std::vector<uint8_t>(text.begin(), text.end()),
-                             why);
+    return write_settings_file(thepath, recording_settings_file(thepath), text, why);
 }
 
 }  // namespace ondrel

@@ -5,6 +5,7 @@
 #include <cstring>
 #include <vector>
 
+#include "playback/note_names.h"
 #include "shell/fast_fourier_transform.h"
 #include "shell/fft_windows.h"
 
@@ -32,17 +33,9 @@ double frame_value(const p_s& s, uint32_t i) {
 }  // namespace
 
 std::string note_text(int note) {
-    static const char* const kNames[12] = {"C ", "C#", "D ", "D#", "E ", "F ",
-                                           "F#", "G ", "G#", "A ", "A#", "B "};
     if (note < 0) return "----";
-    std::string text = kNames[note % 12];
-    if (note >= 24) {
-        text += ' ';
-        text += static_cast<char>('0' + std::min((note - 24) / 12, 9));
-    } else {
-        text += '-';
-        text += static_cast<char>('0' + 2 - note / 12);
-    }
+    char text[5];
+    const_midit(std::min(note, 127), text);
     return text;
 }
 

@@ -27,6 +27,7 @@ void cmd_open_window(Program& p, const ShellMessage& m) {
         case fourcc("Srch"): w.search = true; break;
         case fourcc("XPdl"): w.transpose = true; break;
         case fourcc("SMch"): w.midi_channel = true; break;
+        case fourcc("MPRT"): w.midi_ports = true; break;
         default: break;
     }
 }

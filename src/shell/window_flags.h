@@ -12,6 +12,7 @@ struct WindowFlags {
     bool search = false;    // find and replace
     bool transpose = false;
     bool midi_channel = false;  // "Set Midi chanel" for the cursor's track
+    bool midi_ports = false;    // the synthesiser, the MIDI output and input
     bool full_screen = false;
     bool arrangement_follow = false;  // play started or stopped, or the cursor jumped
 };

@@ -152,6 +152,18 @@ with tempfile.TemporaryDirectory() as tmp:
                        ([DEMO, "-o", missing_dir], 1)):
         check(f"export-midi {args}", run("export-midi", *args).returncode == code)
 
+    # The synthesiser idle (the demo has no MIDI track) adds nothing; a SoundFont that is not
+    # there stops the command before it writes.
+    if os.path.exists("/usr/share/sounds/sf2/TimGM6mb.sf2"):
+        synth_out = os.path.join(tmp, "synth.wav")
+        r = run("render", DEMO, "-o", synth_out, "--max-seconds", "1.5", "--float", "--quality",
+                "interpolation", "--midi-synth")
+        check("render --midi-synth", r.returncode == 0 and open(synth_out, "rb").read() == open(short, "rb").read(),
+              r.stderr)
+    r = run("render", DEMO, "-o", os.path.join(tmp, "none.wav"), "--midi-synth", "/no/such.sf2")
+    check("render --midi-synth with a missing SoundFont", r.returncode == 1 and r.stderr.count("\n") == 1
+          and not os.path.exists(os.path.join(tmp, "none.wav")), r.stderr)
+
     # Live play through SDL's dummy and disk drivers (no sound card needed).
     env = dict(os.environ, SDL_AUDIODRIVER="dummy")
     r = subprocess.run([ONDREL, "play", DEMO, "--max-seconds", "1"], capture_output=True, text=True,

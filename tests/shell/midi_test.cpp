@@ -122,6 +122,7 @@ TEST(MidiInput, NotesPlayedAreEnteredAtTheCursorOnlyInEditMode) {
     EXPECT_EQ(cell(0).note, 0);  // heard, not written
     p.post(fourcc("EDmd"));
     p.engine.player.cursor.cursnd = 2;
+    p.engine.player.cursor.poscurx = kFieldVolume0;  // a MIDI key is no digit: the note goes in
     note(62, 100);
     note(70, 0);  // a note-on without velocity plays nothing
     note(74, 1);

@@ -10,6 +10,7 @@
 #include "shell/gui/gui_host.h"
 #include "shell/gui/main_window.h"
 #include "shell/program.h"
+#include "shell/midi_settings.h"
 #include "shell/recording_settings.h"
 #include "shell/user_directories.h"
 
@@ -53,6 +54,13 @@ int run_desktop(const std::vector<std::string>& files) {
         program.audio_status = "no sound device";
         std::cerr << "ondrel: " << why << "\n";
     }
+    const MidiSettings midi = read_midi_settings(config_directory());
+    program.midi.soundfont = midi.soundfont;
+    program.midi.start_ports(midi.input);
+    if (!program.midi.ports()->available())
+        program.say("No MIDI ports: " + program.midi.ports()->unavailable_reason());
+    else if (!midi.output.empty() && !program.midi.choose_output(midi.output, why))
+        program.say(why);
     read_info_path(program.paths, config_directory());
     program.browser = std::make_unique<FileBrowser>(program.paths.browser_directory);
     program.on_quit = [&program] {
@@ -62,6 +70,8 @@ int run_desktop(const std::vector<std::string>& files) {
         if (!write_info_path(program.paths, config_directory(), failed))
             std::cerr << "ondrel: " << failed << "\n";
         if (!write_recording_settings(program.recording, config_directory(), failed))
+            std::cerr << "ondrel: " << failed << "\n";
+        if (!write_midi_settings(program.midi, config_directory(), failed))
             std::cerr << "ondrel: " << failed << "\n";
     };
     offer_recovery_copies(program);

@@ -13,6 +13,7 @@
 #include "shell/gui/instrument_editor.h"
 #include "shell/gui/instrument_list_window.h"
 #include "shell/gui/menu_bar.h"
+#include "shell/gui/midi_window.h"
 #include "shell/gui/pane.h"
 #include "shell/gui/record_panel.h"
 #include "shell/gui/song_pane.h"
@@ -61,6 +62,7 @@ void MainWindow::draw() {
     draw_search_window(p_);
     draw_transpose_window(p_);
     draw_midi_channel_window(p_, *song_);
+    draw_midi_window(p_);
     draw_text_windows(p_);
     analyser_window_.draw(p_);
     file_panel_.draw(p_);

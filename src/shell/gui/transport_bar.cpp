@@ -46,6 +46,10 @@ float draw_transport_bar(Program& p, const TMOD& song, float top) {
     const p_s* sound = p.engine.bank.song_sample(instrument - 1);
     ImGui::Text("Octave %d  Step %d  Instrument %02d %s", p.editor.octave, int(player.cursor.jumpstep),
                 instrument, sound ? sound->name : "(empty)");
+    if (p.editor.midi_range_low[0]) {
+        ImGui::SameLine(0, 24);
+        ImGui::Text("MIDI %s .. %s", p.editor.midi_range_low.data(), p.editor.midi_range_high.data());
+    }
     ImGui::SameLine(0, 24);
     ImGui::Text("Song \"%s\"  %d tracks", song.name[0] ? song.name : "No name", int(song.nbtrack));
     ImGui::End();
