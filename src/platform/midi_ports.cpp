@@ -75,30 +75,36 @@ std::vector<std::string> MidiPorts::input_names() const {
     return names_of(probe_in_.get());
 }
 
-bool MidiPorts::open_output(const std::string& name, std::string& why) {
-    close_output();
+template <class Port, class Prepare>
+std::unique_ptr<Port> MidiPorts::open_port(Port* probe, const std::string& name, const char* kind,
+                                           std::string& why, Prepare prepare) {
     if (!available_) {
         why = why_;
-        return false;
+        return nullptr;
     }
-    const int index = index_of(probe_out_.get(), name);
+    const int index = index_of(probe, name);
+    const std::string port = std::string("MIDI ") + kind + " port \"" + name + "\"";
     if (index < 0) {
-        why = "no MIDI output port \"" + name + "\"";
-        return false;
+        why = "no " + port;
+        return nullptr;
     }
     try {
-        auto out = std::make_unique<RtMidiOut>(static_cast<RtMidi::Api>(api_), "Ondrel Tracker output");
-        out->setErrorCallback(ignore_error);
-        out->openPort(static_cast<unsigned>(index), "Ondrel Tracker");
-        if (!out->isPortOpen()) {
-            why = "cannot open the MIDI output port \"" + name + "\"";
-            return false;
-        }
-        out_ = std::move(out);
+        auto opened = std::make_unique<Port>(static_cast<RtMidi::Api>(api_), std::string("Ondrel Tracker ") + kind);
+        opened->setErrorCallback(ignore_error);
+        prepare(*opened);
+        opened->openPort(static_cast<unsigned>(index), "Ondrel Tracker");
+        if (opened->isPortOpen()) return opened;
+        why = "cannot open the " + port;
     } catch (const RtMidiError& e) {
-        why = "cannot open the MIDI output port \"" + name + "\": " + e.getMessage();
-        return false;
+        why = "cannot open the " + port + ": " + e.getMessage();
     }
+    return nullptr;
+}
+
+bool MidiPorts::open_output(const std::string& name, std::string& why) {
+    close_output();
+    out_ = open_port<RtMidiOut>(probe_out_.get(), name, "output", why, [](RtMidiOut&) {});
+    if (!out_) return false;
     output_name_ = name;
     MidiEvent stale;
     while (out_queue_.pop(stale)) {
@@ -142,32 +148,13 @@ void MidiPorts::send_loop() {
 
 bool MidiPorts::open_input(const std::string& name, NoteHandler on_note, std::string& why) {
     close_input();
-    if (!available_) {
-        why = why_;
-        return false;
-    }
-    const int index = index_of(probe_in_.get(), name);
-    if (index < 0) {
-        why = "no MIDI input port \"" + name + "\"";
-        return false;
-    }
-    try {
-        auto in = std::make_unique<RtMidiIn>(static_cast<RtMidi::Api>(api_), "Ondrel Tracker input");
-        in->setErrorCallback(ignore_error);
-        in->ignoreTypes(true, true, true);
-        on_note_ = std::move(on_note);
-        parser_ = MidiInputParser();
-        in->setCallback(&MidiPorts::input_callback, this);
-        in->openPort(static_cast<unsigned>(index), "Ondrel Tracker");
-        if (!in->isPortOpen()) {
-            why = "cannot open the MIDI input port \"" + name + "\"";
-            return false;
-        }
-        in_ = std::move(in);
-    } catch (const RtMidiError& e) {
-        why = "cannot open the MIDI input port \"" + name + "\": " + e.getMessage();
-        return false;
-    }
+    on_note_ = std::move(on_note);
+    parser_ = MidiInputParser();
+    in_ = open_port<RtMidiIn>(probe_in_.get(), name, "input", why, [this](RtMidiIn& in) {
+        in.ignoreTypes(true, true, true);
+        in.setCallback(&MidiPorts::input_callback, this);
+    });
+    if (!in_) return false;
     input_name_ = name;
     return true;
 }

@@ -50,6 +50,10 @@ public:
     const std::string& input_name() const { return input_name_; }
 
 private:
+    // A port of the system opened by name, prepare() run on it first; null with why set.
+    template <class Port, class Prepare>
+    std::unique_ptr<Port> open_port(Port* probe, const std::string& name, const char* kind, std::string& why,
+                                    Prepare prepare);
     static void input_callback(double, std::vector<unsigned char>* message, void* self);
     void send_loop();
 
