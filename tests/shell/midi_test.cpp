@@ -6,8 +6,10 @@
 #include <chrono>
 #include <cmath>
 #include <cstdio>
+#include <deque>
 #include <fstream>
 #include <functional>
+#include <mutex>
 #include <thread>
 
 #include "jack_server.h"
@@ -38,9 +40,9 @@ float render_peak(Program& p, double seconds) {
     return peak;
 }
 
-// Runs the program's queue until done() or two seconds have passed.
+// Runs the program's queue until done() or five seconds have passed.
 bool run_until(Program& p, const std::function<bool()>& done) {
-    const auto limit = std::chrono::steady_clock::now() + std::chrono::seconds(2);
+    const auto limit = std::chrono::steady_clock::now() + std::chrono::seconds(5);
     while (std::chrono::steady_clock::now() < limit) {
         p.run_pending();
         if (done()) return true;
@@ -144,7 +146,19 @@ TEST(MidiPorts, RealPortsCarryNotesInThroughAndOut) {
     if (!jack.running()) GTEST_SKIP() << "no JACK server could be started";
     RtMidiOut keyboard(RtMidi::UNIX_JACK, "test keyboard");
     keyboard.openVirtualPort("keys");
+    // What reaches the sink, handed over from JACK's thread.
+    struct Received {
+        std::mutex lock;
+        std::deque<std::vector<unsigned char>> messages;
+    } received;
     RtMidiIn sink(RtMidi::UNIX_JACK, "test sink");
+    sink.setCallback(
+        [](double, std::vector<unsigned char>* m, void* to) {
+            auto* r = static_cast<Received*>(to);
+            std::lock_guard<std::mutex> hold(r->lock);
+            r->messages.push_back(*m);
+        },
+        &received);
     sink.openVirtualPort("sink");
 
     Program p;
@@ -157,16 +171,26 @@ TEST(MidiPorts, RealPortsCarryNotesInThroughAndOut) {
     // A note from the keyboard is entered, and passed through to the output.
     p.post(fourcc("EDmd"));
     p.run_pending();
+    // JACK makes a connection in its own time: the keyboard plays until its note is in.
     std::vector<unsigned char> on{0x90, 64, 90};
-    keyboard.sendMessage(&on);
-    EXPECT_TRUE(run_until(p, [&p] { return p.engine.bank.song_pattern(0)->col[0][0].note == 64; }));
-    const auto receive = [&sink](std::vector<unsigned char> wanted) {
-        const auto limit = std::chrono::steady_clock::now() + std::chrono::seconds(2);
-        std::vector<unsigned char> got;
+    EXPECT_TRUE(run_until(p, [&] {
+        if (p.engine.bank.song_pattern(0)->col[0][0].note == 64) return true;
+        keyboard.sendMessage(&on);
+        std::this_thread::sleep_for(std::chrono::milliseconds(50));
+        return false;
+    }));
+    const auto receive = [&received](std::vector<unsigned char> wanted) {
+        const auto limit = std::chrono::steady_clock::now() + std::chrono::seconds(5);
         while (std::chrono::steady_clock::now() < limit) {
-            sink.getMessage(&got);
+            std::unique_lock<std::mutex> hold(received.lock);
+            if (received.messages.empty()) {
+                hold.unlock();
+                std::this_thread::sleep_for(std::chrono::milliseconds(2));
+                continue;
+            }
+            const std::vector<unsigned char> got = received.messages.front();
+            received.messages.pop_front();
             if (got == wanted) return true;
-            if (got.empty()) std::this_thread::sleep_for(std::chrono::milliseconds(2));
         }
         return false;
     };
