@@ -20,20 +20,28 @@ RtMidi::Api chosen_api() {
 // told through return values instead.
 void ignore_error(RtMidiError::Type, const std::string&, void*) {}
 
+// Our own ports are not offered: our output sent to our input would go round for ever.
+bool is_own_port(const std::string& name) {
+    return name.rfind("Ondrel Tracker", 0) == 0;
+}
+
 template <class Port>
 std::vector<std::string> names_of(Port* port) {
     std::vector<std::string> names;
     if (!port) return names;
     const unsigned count = port->getPortCount();
-    for (unsigned i = 0; i < count; ++i) names.push_back(port->getPortName(i));
+    for (unsigned i = 0; i < count; ++i)
+        if (std::string name = port->getPortName(i); !is_own_port(name)) names.push_back(std::move(name));
     return names;
 }
 
+// The system's number of the port of that name, or -1.
 template <class Port>
 int index_of(Port* port, const std::string& name) {
-    const auto names = names_of(port);
-    for (size_t i = 0; i < names.size(); ++i)
-        if (names[i] == name) return static_cast<int>(i);
+    if (!port || is_own_port(name)) return -1;
+    const unsigned count = port->getPortCount();
+    for (unsigned i = 0; i < count; ++i)
+        if (port->getPortName(i) == name) return static_cast<int>(i);
     return -1;
 }
 
