@@ -61,31 +61,25 @@ void MidiSetup::refresh_port_lists() {
 }
 
 bool MidiSetup::choose_output(const std::string& name, std::string& why) {
-    if (!ports_) {
-        why = "no MIDI ports";
-        return false;
-    }
-    if (name.empty()) {
-        ports_->close_output();
-        outputs_changed();
-        return true;
-    }
-    const bool opened = ports_->open_output(name, why);
+    if (!has_ports(why)) return false;
+    const bool chosen = name.empty() ? (ports_->close_output(), true) : ports_->open_output(name, why);
     outputs_changed();
-    return opened;
+    return chosen;
 }
 
 bool MidiSetup::choose_input(const std::string& name, std::string& why) {
-    if (!ports_) {
-        why = "no MIDI ports";
-        return false;
-    }
+    if (!has_ports(why)) return false;
     if (name.empty()) {
         ports_->close_input();
         return true;
     }
     return ports_->open_input(
         name, [this](int note, int velocity) { from_input_.push(Message{kMsgMidiNote, note, velocity}); }, why);
+}
+
+bool MidiSetup::has_ports(std::string& why) const {
+    if (!ports_) why = "no MIDI ports";
+    return ports_ != nullptr;
 }
 
 bool MidiSetup::poll(Message& m) {

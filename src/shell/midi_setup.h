@@ -57,6 +57,7 @@ private:
     // The sequencer sends to the router while any output is attached; after a change the
     // audio callback in progress is waited out, so what was detached can be freed.
     void outputs_changed();
+    bool has_ports(std::string& why) const;
 
     Engine& engine_;
     MidiEventQueue synth_events_;  // outlives every synthesiser, as senders may still hold it
