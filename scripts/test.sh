@@ -20,6 +20,7 @@ scripts/build.sh build-tsan -DONDREL_TESTS=ON -DONDREL_BENCH=OFF -DONDREL_SANITI
 # FluidSynth loads samples on OpenMP threads whose barriers ThreadSanitizer cannot see: one
 # thread keeps those runs in order. JACK's ring buffer is the one other library structure
 # it misreads (tests/tsan_suppressions.txt).
+suppressions="$PWD/tests/tsan_suppressions.txt"
 (cd build-tsan && OMP_NUM_THREADS=1 \
-   TSAN_OPTIONS="halt_on_error=1 suppressions=$PWD/tests/tsan_suppressions.txt" \
+   TSAN_OPTIONS="halt_on_error=1 suppressions=$suppressions" \
    ctest --output-on-failure -j "$(nproc)")
