@@ -2,11 +2,9 @@
 
 #include <gtest/gtest.h>
 
-#include <chrono>
-#include <thread>
-
 #include "browser_tree.h"
 #include "playback/messages.h"
+#include "support/wait_until.h"
 
 namespace ondrel {
 namespace {
@@ -19,9 +17,7 @@ const char* const kTree =
 
 // Waits, as the window's frames would, for the listing under way.
 void settle(FileBrowser& browser) {
-    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(20);
-    while (browser.loading() && std::chrono::steady_clock::now() < deadline)
-        std::this_thread::sleep_for(std::chrono::milliseconds(1));
+    test::wait_until([&] { return !browser.loading(); });
     browser.update();
 }
 

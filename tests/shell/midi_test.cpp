@@ -8,13 +8,13 @@
 #include <cstdio>
 #include <deque>
 #include <fstream>
-#include <functional>
 #include <mutex>
 #include <thread>
 
 #include "jack_server.h"
 #include "render/offline_render.h"
-#include "shell/program.h"
+#include "shell/program_fixture.h"
+#include "support/wait_until.h"
 
 namespace ondrel {
 namespace {
@@ -38,17 +38,6 @@ float render_peak(Program& p, double seconds) {
                        return true;
                    });
     return peak;
-}
-
-// Runs the program's queue until done() or five seconds have passed.
-bool run_until(Program& p, const std::function<bool()>& done) {
-    const auto limit = std::chrono::steady_clock::now() + std::chrono::seconds(5);
-    while (std::chrono::steady_clock::now() < limit) {
-        p.run_pending();
-        if (done()) return true;
-        std::this_thread::sleep_for(std::chrono::milliseconds(5));
-    }
-    return false;
 }
 
 TEST(MidiSynth, MidiTracksSoundThroughTheSynthesiserAndOnlyWhileItIsOpen) {
@@ -78,8 +67,7 @@ TEST(MidiSynth, LaunchingAsksFirstAndABadSoundFontLeavesItClosed) {
         const Alert* a = p.alerts.front();
         return a ? *a : Alert{"", "(no alert)", {}};
     };
-    p.post(fourcc("MSYN"));
-    p.run_pending();
+    test::run(p, "MSYN");
     ASSERT_EQ(p.alerts.size(), 1u);
     EXPECT_EQ(shown().text, "Launch Internal Midi Synth ? This take some more resource ! ");
     EXPECT_EQ(shown().buttons, (std::vector<std::string>{"Yes", "No !!"}));
@@ -89,8 +77,7 @@ TEST(MidiSynth, LaunchingAsksFirstAndABadSoundFontLeavesItClosed) {
     for (const std::string& soundfont : {broken, std::string("/no/such/file.sf2")}) {
         SCOPED_TRACE(soundfont);
         p.midi.soundfont = soundfont;
-        p.post(fourcc("MSYN"));
-        p.run_pending();
+        test::run(p, "MSYN");
         p.alerts.answer(0);  // "Yes"
         ASSERT_EQ(p.alerts.size(), 1u);
         EXPECT_NE(shown().text.find(soundfont), std::string::npos) << shown().text;
@@ -102,12 +89,10 @@ TEST(MidiSynth, LaunchingAsksFirstAndABadSoundFontLeavesItClosed) {
 
     if (FluidSynthesiser::default_soundfont().empty()) return;
     p.midi.soundfont.clear();
-    p.post(fourcc("MSYN"));
-    p.run_pending();
+    test::run(p, "MSYN");
     p.alerts.answer(0);
     EXPECT_TRUE(p.midi.synth_open());
-    p.post(fourcc("MSYN"));
-    p.run_pending();
+    test::run(p, "MSYN");
     EXPECT_EQ(shown().text, "Destroy Internal Midi Synth ? This free some resource !");
     p.alerts.answer(0);
     EXPECT_FALSE(p.midi.synth_open());
@@ -117,8 +102,7 @@ TEST(MidiInput, NotesPlayedAreEnteredAtTheCursorOnlyInEditMode) {
     Program p;
     const auto cell = [&p](int row) { return p.engine.bank.song_pattern(0)->col[0][row]; };
     const auto note = [&p](int n, int vel) {
-        p.post(ShellMessage(fourcc("midi")).with("note", n).with("vel", vel));
-        p.run_pending();
+        test::run(p, ShellMessage(fourcc("midi")).with("note", n).with("vel", vel));
     };
     note(62, 100);
     EXPECT_EQ(cell(0).note, 0);  // heard, not written
@@ -171,36 +155,31 @@ TEST(MidiPorts, RealPortsCarryNotesInThroughAndOut) {
     ASSERT_TRUE(p.midi.choose_output("test sink:sink", why)) << why;
 
     // A note from the keyboard is entered, and passed through to the output.
-    p.post(fourcc("EDmd"));
-    p.run_pending();
+    test::run(p, "EDmd");
     // JACK makes a connection in its own time: the keyboard plays until its note is in.
     std::vector<unsigned char> on{0x90, 64, 90};
-    EXPECT_TRUE(run_until(p, [&] {
+    EXPECT_TRUE(test::wait_until([&] {
+        p.run_pending();
         if (p.engine.bank.song_pattern(0)->col[0][0].note == 64) return true;
         keyboard.sendMessage(&on);
         std::this_thread::sleep_for(std::chrono::milliseconds(50));
         return false;
     }));
-    const auto receive = [&received](std::vector<unsigned char> wanted) {
-        const auto limit = std::chrono::steady_clock::now() + std::chrono::seconds(5);
-        while (std::chrono::steady_clock::now() < limit) {
-            std::unique_lock<std::mutex> hold(received.lock);
-            if (received.messages.empty()) {
-                hold.unlock();
-                std::this_thread::sleep_for(std::chrono::milliseconds(2));
-                continue;
+    const auto receive = [&received](const std::vector<unsigned char>& wanted) {
+        return test::wait_until([&] {
+            std::lock_guard<std::mutex> hold(received.lock);
+            while (!received.messages.empty()) {
+                const bool found = received.messages.front() == wanted;
+                received.messages.pop_front();
+                if (found) return true;
             }
-            const std::vector<unsigned char> got = received.messages.front();
-            received.messages.pop_front();
-            if (got == wanted) return true;
-        }
-        return false;
+            return false;
+        });
     };
     EXPECT_TRUE(receive({0x90, 64, 90}));
 
     // The song's MIDI track reaches the port as the sequencer sends it.
-    p.post(fourcc("EDmd"));
-    p.run_pending();
+    test::run(p, "EDmd");
     make_midi_song(p, 2, 1);  // beside the track the keyboard's note went to
     render_peak(p, 1.2);
     EXPECT_TRUE(receive({0x91, 60, 127}));
@@ -210,7 +189,10 @@ TEST(MidiPorts, RealPortsCarryNotesInThroughAndOut) {
 
     // The port goes away: sending stops, the window is told once.
     sink.closePort();
-    EXPECT_TRUE(run_until(p, [&p] { return p.engine.player.papi.load() == nullptr; }));
+    EXPECT_TRUE(test::wait_until([&p] {
+        p.run_pending();
+        return p.engine.player.papi.load() == nullptr;
+    }));
     EXPECT_NE(p.last_said().find("went away"), std::string::npos) << p.last_said();
 }
 

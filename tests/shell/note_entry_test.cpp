@@ -63,28 +63,29 @@ protected:
         p.run_pending();
     }
     void release(int32_t k) { p.key_up({k, kModNone}); }
+    void tap(int32_t k) {
+        key(k);
+        release(k);
+    }
     TNOTE cell(int track, int row) const { return p.engine.bank.song_pattern(0)->col[track][row]; }
     int row() const { return p.engine.player.cursor.poscurv; }
     Program p;
 };
 
 TEST_F(NoteEntry, KeysWriteOnlyInEditModeAndMoveByTheJumpStep) {
-    key('z');
-    release('z');
+    tap('z');
     EXPECT_EQ(cell(0, 0).note, 0);  // outside edit mode a key only plays
     key(kKeySpace);
     key('3', kModCtrl);  // "Jump 3 lines"
     p.engine.player.cursor.cursnd = 4;
-    key('z');
-    release('z');
+    tap('z');
     EXPECT_EQ(cell(0, 0), (TNOTE{60, 0, 0, 5, 0, 0}));
     EXPECT_EQ(row(), 3);
     key('1');
     EXPECT_EQ(cell(0, 3).note, 0x80);
     EXPECT_EQ(row(), 6);
     key(kKeyPadPlus);
-    key('q');
-    release('q');
+    tap('q');
     EXPECT_EQ(cell(0, 6).note, 84);
     // Ctrl+Z takes the steps back one by one.
     key('z', kModCtrl);
@@ -155,26 +156,17 @@ TEST_F(NoteEntry, KeypadSlashAndStarChooseThePreviousAndNextInstrument) {
 
 TEST_F(NoteEntry, KeysHeldTogetherMakeAChordAcrossTracks) {
     key(kKeySpace);
-    key('z');
-    key('c');
-    key('b');
-    release('z');
-    release('c');
-    release('b');
-    EXPECT_EQ(cell(0, 0).note, 60);
-    EXPECT_EQ(cell(1, 0).note, 64);
-    EXPECT_EQ(cell(2, 0).note, 67);
-    EXPECT_EQ(row(), 1);
+    for (char k : {'z', 'c', 'b'}) key(k);
+    for (char k : {'z', 'c', 'b'}) release(k);
+    EXPECT_EQ(std::make_tuple(cell(0, 0).note, cell(1, 0).note, cell(2, 0).note, row()),
+              std::make_tuple(60, 64, 67, 1));
     key('x');  // alone again: the next row, the cursor's track
     EXPECT_EQ(cell(0, 1).note, 62);
 }
 
 TEST_F(NoteEntry, BlocksAreMarkedCopiedPastedAndTransposed) {
     key(kKeySpace);
-    for (char k : {'z', 'x', 'c'}) {
-        key(k);
-        release(k);
-    }
+    for (char k : {'z', 'x', 'c'}) tap(k);
     key(kKeyHome);
     key(kKeyDown, kModShift);
     key(kKeyDown, kModShift);  // rows 0 to 2 of track 0

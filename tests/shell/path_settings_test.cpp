@@ -16,10 +16,6 @@ std::string read_text(const std::string& path) {
     return {bytes.begin(), bytes.end()};
 }
 
-void write_text(const TempDir& dir, const std::string& text) {
-    dir.write("ondrel.txt", std::vector<uint8_t>(text.begin(), text.end()));
-}
-
 // "DIR | music... | sound..." with the temporary directory shown as "@".
 std::string summary(const PathSettings& s, const std::string& existing) {
     std::string out = s.browser_directory == existing ? "@" : s.browser_directory;
@@ -60,7 +56,7 @@ TEST(PathFile, ReadsTheGrammarWithItsQuirks) {
         const std::string existing = dir.path().string();
         std::string text = c.file;
         if (const size_t at = text.find('@'); at != std::string::npos) text.replace(at, 1, existing);
-        write_text(dir, text);
+        dir.write("ondrel.txt", std::vector<uint8_t>(text.begin(), text.end()));
         PathSettings settings("/start");
         read_info_path(settings, existing);
         EXPECT_EQ(summary(settings, existing), c.expected);

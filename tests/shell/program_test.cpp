@@ -7,7 +7,7 @@
 
 #include "edit/sound_blocks.h"
 #include "shell/editor_cursor.h"
-#include "support/temp_dir.h"
+#include "shell/program_fixture.h"
 
 namespace ondrel {
 namespace {
@@ -15,30 +15,17 @@ namespace {
 const std::string kModule = "../shared/corpus/mod/TDZ3.MOD";
 const std::string kSound = "../shared/corpus/sound/blip.wav";
 
-class ProgramTest : public ::testing::Test {
+class ProgramTest : public test::ProgramFixture {
 protected:
     void SetUp() override {
         for (const auto& f : {kModule, kSound})
             if (!std::filesystem::exists(f)) GTEST_SKIP() << f << " is missing";
-    }
-    void open(const std::vector<std::string>& paths) {
-        ShellMessage m(fourcc("refs"));
-        m.refs = paths;
-        p.post(m);
-        p.run_pending();
-    }
-    void run(const char (&code)[5]) {
-        p.post(fourcc(code));
-        p.run_pending();
     }
     // A cell change the way an editor command makes one.
     void change_a_cell() {
         p.edit("cell", [](SongTransaction& t) { t.pattern(t.live().sequence[0])->col[0][0].note = 49; });
     }
     std::string front_text() const { return p.alerts.front() ? p.alerts.front()->text : ""; }
-
-    Program p;
-    test::TempDir dir;
 };
 
 TEST_F(ProgramTest, OpensModulesSoundsAndRefusesTheRest) {
@@ -72,8 +59,7 @@ TEST_F(ProgramTest, MultipleMusicLoadingAddsSongsThatCanBeChosenAndKilled) {
     open({kModule, kModule});
     EXPECT_EQ(p.engine.bank.nbimod, 3);
     EXPECT_EQ(p.engine.bank.noimod, 2);
-    p.post(fourcc("ZI00") + 1);
-    p.run_pending();
+    test::run(p, ShellMessage(fourcc("ZI00") + 1));
     EXPECT_EQ(p.engine.bank.noimod, 1);
     run("kiLL");
     EXPECT_EQ(p.engine.bank.nbimod, 2);
@@ -100,10 +86,7 @@ TEST_F(ProgramTest, SavingAForeignSongAsksForANativeFileAndKeepsTheOriginal) {
     EXPECT_FALSE(p.file_panel.open());
     EXPECT_FALSE(p.history().dirty());
     Program again;
-    ShellMessage m(fourcc("refs"));
-    m.refs = {dir.file("copy.otm")};
-    again.post(m);
-    again.run_pending();
+    test::open_files(again, {dir.file("copy.otm")});
     EXPECT_EQ(again.engine.bank.song_pattern(again.engine.bank.current().sequence[0])->col[0][0].note, 49);
 }
 
@@ -154,46 +137,34 @@ TEST_F(ProgramTest, KeysReachTheTransportTheOptionsAndTheCursor) {
     p.key_down(plain(kKeyF1 + 7));  // F8
     p.run_pending();
     EXPECT_EQ(p.engine.player.tr.playing, 0);
-    p.key_down(ctrl('3'));
-    p.run_pending();
-    EXPECT_EQ(p.engine.player.cursor.jumpstep, 3);
     p.key_down(plain(kKeyUp));  // from row 0 up wraps to the pattern's last row
     EXPECT_EQ(p.engine.player.cursor.poscurv,
               p.engine.bank.current().rows[p.engine.bank.current().sequence[0]] - 1);
     p.key_down(plain(kKeyTab));
     EXPECT_EQ(p.engine.player.cursor.track, 1);
-    p.key_down(plain(kKeySpace));
-    p.run_pending();
-    EXPECT_TRUE(p.editor.edit_mode);
 }
 
-TEST_F(ProgramTest, OptionTogglesShowTheirState) {
-    struct Toggle {
+// The pan modes are checked by their marks in the command table's tests.
+TEST_F(ProgramTest, OptionsChangeWhatTheyName) {
+    struct Option {
         const char* code;
         bool (*on)(const Program&);
     };
-    const Toggle toggles[] = {
+    const Option options[] = {
         {"GOte", [](const Program& q) { return q.engine.mixer.ftemp != 0; }},
         {"vuvu", [](const Program& q) { return q.engine.player.tr.fvuvu != 0; }},
         {"accd", [](const Program& q) { return q.engine.player.tr.faccedit != 0; }},
         {"MulL", [](const Program& q) { return q.engine.bank.fmulload != 0; }},
         {"full", [](const Program& q) { return q.windows.full_screen; }},
+        {"Mint", [](const Program& q) { return q.engine.mixer.qual == 1; }},
+        {"ATRI", [](const Program& q) { return q.editor.layout == KeyboardLayout::Atari; }},
     };
-    for (const Toggle& t : toggles) {
-        SCOPED_TRACE(t.code);
-        const bool before = t.on(p);
-        p.post(fourcc(*reinterpret_cast<const char(*)[5]>(t.code)));
-        p.run_pending();
-        EXPECT_NE(t.on(p), before);
+    for (const Option& o : options) {
+        SCOPED_TRACE(o.code);
+        const bool before = o.on(p);
+        run(o.code);
+        EXPECT_NE(o.on(p), before);
     }
-    run("Mami");
-    EXPECT_EQ(p.engine.bank.current().mode, 1);
-    run("Mler");
-    EXPECT_EQ(p.engine.bank.current().mode, 3);
-    run("Mint");
-    EXPECT_EQ(p.engine.mixer.qual, 1);
-    run("ATRI");
-    EXPECT_EQ(p.editor.layout, KeyboardLayout::Atari);
 }
 
 TEST(AlertKeys, EnterNeverTakesADestructiveChoiceAndEscapeTakesCancelOrTheFirst) {
@@ -264,8 +235,7 @@ TEST(ProgramSearch, ReplaceTakesTheHitUnderTheCursorThenFindsTheNextAndNeverLeav
         p.editor.search.replace.note = 50;
         p.editor.block = {c.block, 0, 0, 0, 4};
         set_cursor_place(p, c.cursor);
-        p.post(fourcc(*reinterpret_cast<const char(*)[5]>(c.code)));
-        p.run_pending();
+        test::run(p, c.code);
         EXPECT_EQ(notes(), c.notes);
         EXPECT_EQ(std::make_pair(cursor_place(p).row, cursor_place(p).track),
                   std::make_pair(c.then.row, c.then.track));
@@ -273,8 +243,7 @@ TEST(ProgramSearch, ReplaceTakesTheHitUnderTheCursorThenFindsTheNextAndNeverLeav
         // All of it one undo step.
         const bool changed = c.notes != std::vector<int>{49, 49, 49};
         EXPECT_EQ(p.history().can_undo(), changed);
-        p.post(fourcc("UNDO"));
-        p.run_pending();
+        test::run(p, "UNDO");
         EXPECT_EQ(notes(), (std::vector<int>{49, 49, 49}));
         EXPECT_FALSE(p.history().can_undo());
     }
@@ -302,8 +271,7 @@ TEST(ProgramSoundBlocks, AStartMarkMovesTheBlockAndAnEndMarkResizesIt) {
         ShellMessage drag(fourcc("SNbm"));
         drag.with("block", 1).with("first", c.first);
         if (c.end >= 0) drag.with("end", c.end);
-        p.post(drag);
-        p.run_pending();
+        test::run(p, drag);
         const auto block = sound_block(p.engine.bank.current(), p.engine.player.cursor.cursnd, 1, 10);
         ASSERT_TRUE(block);
         EXPECT_EQ(std::make_pair(block->first, block->end), std::make_pair(c.first_after, c.end_after));

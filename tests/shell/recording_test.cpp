@@ -9,10 +9,9 @@
 #include <filesystem>
 #include <fstream>
 
-#include "shell/program.h"
+#include "shell/program_fixture.h"
 #include "shell/recording_settings.h"
 #include "support/fake_capture_input.h"
-#include "support/temp_dir.h"
 #include "support/wait_until.h"
 
 namespace ondrel {
@@ -28,26 +27,12 @@ std::vector<uint8_t> bytes_of(const std::vector<int16_t>& v) {
     return b;
 }
 
-class RecordingTest : public ::testing::Test {
+class RecordingTest : public test::ProgramFixture {
 protected:
     void SetUp() override {
         if (!fs::exists(kModule)) GTEST_SKIP() << kModule << " is missing";
-        open_song();
+        open({kModule});
         p.recording.directory = dir.path().string();
-    }
-    void open_song() {
-        ShellMessage m(fourcc("refs"));
-        m.refs = {kModule};
-        p.post(m);
-        p.run_pending();
-    }
-    void run(const char (&code)[5]) {
-        p.post(fourcc(code));
-        p.run_pending();
-    }
-    void set(const char (&code)[5], int64_t value) {
-        p.post(ShellMessage(fourcc(code)).with("value", value));
-        p.run_pending();
     }
     // Plays the song for frames frames through the render callback, as the sound device
     // would; what the recorder was handed: the output as 16-bit stereo.
@@ -61,9 +46,6 @@ protected:
         return taken;
     }
     const p_s* instrument(int slot) const { return p.engine.bank.song_sample(slot); }
-
-    test::TempDir dir;  // outlives the program, which removes an unused default file
-    Program p;
 };
 
 TEST_F(RecordingTest, TheSongsOutputRecordedInMemoryBecomesTheCurrentInstrumentAndUndoes) {

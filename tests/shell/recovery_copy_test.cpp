@@ -6,8 +6,7 @@
 
 #include "export/otm_writer.h"
 #include "shell/command_handlers.h"
-#include "shell/program.h"
-#include "support/temp_dir.h"
+#include "shell/program_fixture.h"
 
 namespace ondrel {
 namespace {
@@ -63,8 +62,7 @@ TEST(RecoveryCopy, ProgramKeepsUnsavedSongsAndOffersThemBack) {
     {
         Program ended;
         name_song(ended.engine.bank.current(), "first", "/songs/first.otm");
-        ended.post(fourcc("NEWM"));
-        ended.run_pending();
+        test::run(ended, "NEWM");
         name_song(ended.engine.bank.current(), "second", "");
         ended.edit("cell", [](SongTransaction& t) { t.pattern(t.live().sequence[0])->col[0][0].note = 49; });
         ended.quit_on_signal();  // only the second song has changes

@@ -6,8 +6,7 @@
 #include "platform/file_attributes.h"
 #include "shell/command_handlers.h"
 #include "shell/editor_cursor.h"
-#include "shell/program.h"
-#include "support/temp_dir.h"
+#include "shell/program_fixture.h"
 
 namespace ondrel {
 namespace {
@@ -81,12 +80,6 @@ TEST(SongFileAttributesQuiet, MissingFileOrNoPathChangesNothing) {
     EXPECT_EQ(position.oftrack, 5);
 }
 
-}  // namespace
-}  // namespace ondrel
-
-namespace ondrel {
-namespace {
-
 // Opening a song puts the editor where its file says, inside the song whatever the file holds.
 TEST_F(SongFileAttributes, OpeningASongRestoresAPositionInsideIt) {
     Program p;
@@ -98,23 +91,16 @@ TEST_F(SongFileAttributes, OpeningASongRestoresAPositionInsideIt) {
         EditorPosition stored;
         int nopat, row, track, field, view_top, oftrack;
     };
+    // clang-format off
     const Case cases[] = {
         {{0, 5, 2 * kFieldsPerTrack + 3, 4, 1}, 0, 5, 2, 3, 4, 1},
-        {{200, 30000, 32767, 32767, 300},
-         0,
-         rows - 1,
-         tracks - 1,
-         32767 % kFieldsPerTrack,
-         rows - 1,
-         tracks - 1},
+        {{200, 30000, 32767, 32767, 300}, 0, rows - 1, tracks - 1, 32767 % kFieldsPerTrack, rows - 1, tracks - 1},
         {{-5, -1, -9, -2, -3}, 0, 0, 0, 0, 0, 0},
     };
+    // clang-format on
     for (const Case& c : cases) {
         writeinfo_in_file(dir_.file("song.otm"), c.stored);
-        ShellMessage open(fourcc("refs"));
-        open.refs = {dir_.file("song.otm")};
-        p.post(open);
-        p.run_pending();
+        test::open_files(p, {dir_.file("song.otm")});
         EXPECT_EQ(p.engine.player.tr.nopat, c.nopat);
         const CursorPlace at = cursor_place(p);
         EXPECT_EQ(std::tie(at.row, at.track, at.field), std::tie(c.row, c.track, c.field));
