@@ -192,10 +192,8 @@ const std::vector<Edit> kEdits = {
             return after == clip.at(track - at.first_track, row - at.first_row) &&
                    (mode == PasteMode::Replace || before.empty());
         };
-        return Outcome{paste_block(t, at.pattern, at.first_track, at.first_row, clip, mode),
-                       true,
-                       {shown(t, target)},
-                       rule};
+        const int changed = paste_block(t, at.pattern, at.first_track, at.first_row, clip, mode);
+        return Outcome{changed, true, {shown(t, target)}, rule};
     },
     [](SongTransaction& t, Picker& k) {
         const EditRange r = k.range(k.pattern());
@@ -248,13 +246,8 @@ const std::vector<Edit> kEdits = {
     },
     [](SongTransaction& t, Picker& k) {
         const int pick = k.d.in(0, 30);
-        return Outcome{pick == 0   ? remove_sequence(t)
-                       : pick == 1 ? remove_all(t)
-                                   : remove_sounds(t),
-                       false,
-                       {},
-                       kEmptied,
-                       true};
+        const bool done = pick == 0 ? remove_sequence(t) : pick == 1 ? remove_all(t) : remove_sounds(t);
+        return Outcome{done, false, {}, kEmptied, true};
     },
 };
 

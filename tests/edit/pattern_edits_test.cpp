@@ -115,10 +115,7 @@ TEST(PatternEdits, WritingClearingAndRowsOfOneTrack) {
     const Case cases[] = {
         {"write", [](auto& t) { return write_cell(t, 0, 3, 3, {.note = 99}); }, true,
          ". 20 30 40|11 . 31 41|12 22 . 42|13 23 33 99"},
-        {"write the same",
-         [](auto& t) {
-             return write_cell(t, 0, 1, 0, {20, 0, 0, 1, 0, 0});
-         },
+        {"write the same", [](auto& t) { return write_cell(t, 0, 1, 0, {.note = 20, .instrument = 1}); },
          false, kStart},
         {"write past the tracks", [](auto& t) { return write_cell(t, 0, 4, 0, {.note = 99}); }, false,
          kStart},
@@ -251,28 +248,17 @@ TEST(PatternEdits, SearchGoesInReadingOrderAndWrapsAndReplaceWritesOnlyMaskedFie
         int changed;
         std::array<TNOTE, 4> column0;  // track 0 of pattern 0 afterwards
     };
+    const std::array<TNOTE, 4> unchanged = {{{1, 0, 0, 1}, {2, 0, 0, 2}, {126, 0, 0, 1}, {127, 0, 0, 2}}};
+    // clang-format off
     const Replace replaces[] = {
-        {EditRange::of_pattern(0),
-         {.instrument = 1},
-         {.volume = 7},
-         6,
+        {EditRange::of_pattern(0), {.instrument = 1}, {.volume = 7}, 6,
          {{{1, 7, 0, 1}, {2, 0, 0, 2}, {126, 7, 0, 1}, {127, 0, 0, 2}}}},
-        {EditRange::of_track(0, 0),
-         i2,
-         {.note = 5, .instrument = 3, .command = 9, .parameter = 9},
-         2,
+        {EditRange::of_track(0, 0), i2, {.note = 5, .instrument = 3, .command = 9, .parameter = 9}, 2,
          {{{1, 0, 0, 1}, {5, 0, 0, 3, 9, 9}, {126, 0, 0, 1}, {5, 0, 0, 3, 9, 9}}}},
-        {EditRange::of_pattern(0),
-         {.note = 126},
-         {.note = 126, .volume = 0},
-         0,
-         {{{1, 0, 0, 1}, {2, 0, 0, 2}, {126, 0, 0, 1}, {127, 0, 0, 2}}}},
-        {EditRange::of_pattern(0),
-         none,
-         {.note = 1},
-         0,
-         {{{1, 0, 0, 1}, {2, 0, 0, 2}, {126, 0, 0, 1}, {127, 0, 0, 2}}}},
+        {EditRange::of_pattern(0), {.note = 126}, {.note = 126, .volume = 0}, 0, unchanged},
+        {EditRange::of_pattern(0), none, {.note = 1}, 0, unchanged},
     };
+    // clang-format on
     for (const Replace& r : replaces) {
         NoteEnds fresh;
         EXPECT_EQ(edit(fresh, [&](SongTransaction& t) { return replace_all(t, r.range, r.find, r.with); }),

@@ -47,6 +47,7 @@ TEST(SongEdits, PositionCommandsAtTheSequenceEndsKeepTheRepeatOnItsPosition) {
         std::vector<int> sequence;
         int repeat;
     };
+    // clang-format off
     const Case cases[] = {
         {"insert first", [](auto& t) { return insert_position(t, 0, 9); }, true, {9, 5, 6, 7}, 2},
         {"insert at the repeat", [](auto& t) { return insert_position(t, 1, 9); }, true, {5, 9, 6, 7}, 1},
@@ -67,17 +68,15 @@ TEST(SongEdits, PositionCommandsAtTheSequenceEndsKeepTheRepeatOnItsPosition) {
         {"repeat last", [](auto& t) { return set_repeat_position(t, 2); }, true, {5, 6, 7}, 2},
         {"repeat past the end", [](auto& t) { return set_repeat_position(t, 3); }, false, {5, 6, 7}, 1},
         {"new pattern", [](auto& t) { return new_pattern_at(t, 2) == 0; }, true, {5, 6, 0}, 1},
-        {"next position & new pattern",
-         [](auto& t) { return new_position_with_new_pattern(t, 2) == 0; },
-         true,
-         {5, 6, 7, 0},
-         1},
+        {"next position & new pattern", [](auto& t) { return new_position_with_new_pattern(t, 2) == 0; }, true,
+         {5, 6, 7, 0}, 1},
         {"remove a pattern played once", [](auto& t) { return remove_pattern(t, 6); }, true, {5, 7}, 1},
         {"remove a pattern played nowhere", [](auto& t) { return remove_pattern(t, 2); }, true, {5, 6, 7}, 1},
         {"remove a pattern not made", [](auto& t) { return remove_pattern(t, 7); }, true, {5, 6}, 1},
         {"remove nothing", [](auto& t) { return remove_pattern(t, 9); }, false, {5, 6, 7}, 1},
         {"remove the sequence", [](auto& t) { return remove_sequence(t); }, true, {0}, 0},
     };
+    // clang-format on
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         SequenceSong s;
