@@ -8,6 +8,7 @@
 #include "record/frame_convert.h"
 #include "record/record_format.h"
 #include "recorder_fixture.h"
+#include "support/wait_until.h"
 
 namespace ondrel::test {
 namespace {
@@ -92,9 +93,7 @@ TEST_F(DiskRecordingTest, ANewRecordingClearsOnlyTheFirstByteOfTheOldSizes) {
     const auto first = read_all(dir.file("first.wav"));
     start_disk(1, "second.wav");
     feed(kRingHalf / 4 + 10);
-    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-    while (recorder.bytes_written() == 0 && std::chrono::steady_clock::now() < deadline)
-        std::this_thread::sleep_for(std::chrono::milliseconds(1));
+    ASSERT_TRUE(wait_until([&] { return recorder.bytes_written() > 0; }));
     // While it runs the file sits beside its final name, its header as written at the start.
     std::vector<uint8_t> running;
     for (const auto& e : std::filesystem::directory_iterator(dir.path()))

@@ -1,5 +1,6 @@
 // Recording into memory: the capture block becomes the current slot's sound.
 #include <cstring>
+#include <tuple>
 
 #include "record/record_format.h"
 #include "recorder_fixture.h"
@@ -43,16 +44,11 @@ TEST_F(MemoryRecordingTest, StopsItselfAtTheLimitAndBecomesTheSlotsSound) {
         RecordingResult r = recorder.StopRecording();
         ASSERT_TRUE(r.sound);
         const p_s& s = *r.sound;
-        EXPECT_EQ(s.length, buffers_to_fill * per_buffer);
-        EXPECT_EQ(s.rate, 44100u);
-        EXPECT_EQ(s.bits, c.bits);
-        EXPECT_EQ(s.stereo, c.stereo);
-        EXPECT_EQ(s.framecode, c.framecode);
-        EXPECT_EQ(s.loopon, 0);
-        EXPECT_EQ(s.loopstart, 0u);
-        EXPECT_EQ(s.loopend, s.length);
-        EXPECT_EQ(s.refnote, 72);
-        EXPECT_EQ(s.volume, 128);
+        EXPECT_EQ(
+            std::tie(s.length, s.rate, s.bits, s.stereo, s.framecode),
+            std::make_tuple(uint32_t(buffers_to_fill * per_buffer), 44100u, c.bits, c.stereo, c.framecode));
+        EXPECT_EQ(std::tie(s.loopon, s.loopstart, s.loopend, s.refnote, s.volume),
+                  std::make_tuple(uint16_t{0}, 0u, s.length, int16_t{72}, int16_t{128}));
         // The header sits on the first bytes captured: the data begin that many bytes in.
         EXPECT_EQ(s.data, reinterpret_cast<const uint8_t*>(&s) + sizeof(p_s));
         const auto in = ramp_frames(sizeof(p_s) / align + 8,

@@ -86,21 +86,15 @@ TEST(SampleRecord, ResetValuesSlackAndBounds) {
     SampleRef s = make_sample(100);
     EXPECT_EQ(s->data, reinterpret_cast<uint8_t*>(s.get()) + sizeof(p_s));
     for (size_t i = 0; i < 100 + kSampleSlack; ++i) ASSERT_EQ(s->data[i], 0) << i;
-    EXPECT_EQ(s->refnote, 72);
-    EXPECT_EQ(s->level, 64);
-    EXPECT_EQ(s->setting, 102400u);
-    EXPECT_EQ(s->range2[1], 127);
+    EXPECT_EQ(std::make_tuple(s->refnote, s->level, s->setting, s->range2[1]),
+              std::make_tuple(72, 64, 102400u, 127));
     // Envelope 0 is flat at 128, envelope 4 falls from 128 to 0 at x 255.
-    EXPECT_EQ(s->env(0, 2), 128 << 8 | 128);
-    EXPECT_EQ(s->env(2, 1), 64 << 8 | 64);
-    EXPECT_EQ(s->env(4, 1), 64 << 8 | 96);
-    EXPECT_EQ(s->env(4, 4), 255 << 8 | 0);
+    EXPECT_EQ(std::make_tuple(s->env(0, 2), s->env(2, 1), s->env(4, 1), s->env(4, 4)),
+              std::make_tuple(128 << 8 | 128, 64 << 8 | 64, 64 << 8 | 96, 255 << 8 | 0));
     s->volume = 90;
     s->rate = 22050;
     Raz_data(*s);  // keeps data, length and volume
-    EXPECT_EQ(s->volume, 90);
-    EXPECT_EQ(s->rate, 0u);
-    EXPECT_EQ(s->length, 100u);
+    EXPECT_EQ(std::make_tuple(s->volume, s->rate, s->length), std::make_tuple(90, 0u, 100u));
 
     s->bits = 16;
     s->stereo = 1;
@@ -108,10 +102,8 @@ TEST(SampleRecord, ResetValuesSlackAndBounds) {
     s->loopstart = 2000;
     s->loopend = 5000;
     bound_sample(*s);
-    EXPECT_EQ(s->framecode, 2);
-    EXPECT_EQ(s->refnote, 127);
-    EXPECT_EQ(s->loopend, 100u);
-    EXPECT_EQ(s->loopstart, 100u);
+    EXPECT_EQ(std::make_tuple(s->framecode, s->refnote, s->loopstart, s->loopend),
+              std::make_tuple(2, 127, 100u, 100u));
     s->bits = 12;
     bound_sample(*s);
     EXPECT_EQ(s->bits, 8);
@@ -133,17 +125,10 @@ TEST(Record, BoundingClampsIndicesFromFiles) {
     m.nbtrack = 0;
     m.mode = 7;
     bound_record(m);
-    EXPECT_EQ(m.trackvol[3], 127);
-    EXPECT_EQ(m.tracke[4], 0);
-    EXPECT_EQ(m.nbvoice[5], 1);
-    EXPECT_EQ(m.nbvoice[6], 127);
-    EXPECT_EQ(m.efxb[7], 255);
-    EXPECT_EQ(m.efxa[8], 0);
-    EXPECT_EQ(m.rows[8], 1);
-    EXPECT_EQ(m.rows[9], kMaxRows);
-    EXPECT_EQ(m.tempo, 480000u);
-    EXPECT_EQ(m.nbtrack, 1);
-    EXPECT_EQ(m.mode, 2);
+    EXPECT_EQ(std::make_tuple(m.trackvol[3], m.tracke[4], m.nbvoice[5], m.nbvoice[6], m.efxb[7], m.efxa[8]),
+              std::make_tuple(127, 0, 1, 127, 255, 0));
+    EXPECT_EQ(std::make_tuple(m.rows[8], m.rows[9], m.tempo, m.nbtrack, m.mode),
+              std::make_tuple(1, kMaxRows, 480000u, 1, 2));
 }
 
 }  // namespace
