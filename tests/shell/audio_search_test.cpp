@@ -50,12 +50,10 @@ TEST(AudioSearch, FindsTheAudioFilesOfATreeWithProgress) {
     EXPECT_EQ(names, (std::set<std::string>{"top.mod", "a/one.s3m", "a/b/two.wav", "a/b/c/disguised",
                                             "e/THREE.AIFF"}));
     EXPECT_EQ(found.size(), names.size());
+    // Directories: root, a, a/b, a/b/c, a/b/c/d, e and empty.
     const SearchProgress last = search.progress();
-    EXPECT_EQ(last.directories, 7u);  // root, a, a/b, a/b/c, a/b/c/d, e, empty
-    EXPECT_EQ(last.files, 8u);
-    EXPECT_EQ(last.found, 5u);
-    EXPECT_FALSE(last.cancelled);
-    EXPECT_TRUE(last.current.empty());
+    EXPECT_EQ(std::tie(last.directories, last.files, last.found, last.cancelled, last.current),
+              std::make_tuple(7u, 8u, 5u, false, std::string()));
     for (size_t i = 1; i < seen.size(); ++i) EXPECT_LE(seen[i - 1].files, seen[i].files);
 
     // A second search starts clean; one of a vanished root ends at once with nothing.

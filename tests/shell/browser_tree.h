@@ -5,23 +5,15 @@
 #include <string>
 #include <vector>
 
-#include "support/chunk_builder.h"
 #include "support/temp_dir.h"
 
 namespace ondrel::test {
 
-// A WAV header that libmagic knows, for files whose name says nothing.
-inline std::vector<uint8_t> wav_bytes() {
-    Bytes b;
-    b.text("RIFF", 4).le32(36 + 4).text("WAVE", 4).text("fmt ", 4).le32(16);
-    b.le16(1).le16(1).le32(44100).le32(88200).le16(2).le16(16);
-    b.text("data", 4).le32(4).zeros(4);
-    return b.v;
-}
-
 // Makes the files, named relative to the tree and separated by spaces; a trailing '/'
-// makes an empty directory. Files called "disguised*" hold a WAV; the others hold text.
+// makes an empty directory. Files called "disguised*" hold a WAV, one of the readers'
+// cases, for a name that says nothing; the others hold text.
 inline void make_tree(const TempDir& dir, const std::string& names) {
+    const std::vector<uint8_t> wav = read_all("tests/import/cases/wav-16bit-96khz.wav");
     std::istringstream in(names);
     for (std::string f; in >> f;) {
         const std::filesystem::path path = dir.path() / f;
@@ -30,9 +22,9 @@ inline void make_tree(const TempDir& dir, const std::string& names) {
             continue;
         }
         std::filesystem::create_directories(path.parent_path());
-        const bool wav = path.filename().string().rfind("disguised", 0) == 0;
         const std::string text = "not audio\n";
-        dir.write(f, wav ? wav_bytes() : std::vector<uint8_t>(text.begin(), text.end()));
+        const bool disguised = path.filename().string().rfind("disguised", 0) == 0;
+        dir.write(f, disguised ? wav : std::vector<uint8_t>(text.begin(), text.end()));
     }
 }
 

@@ -3,30 +3,23 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
-#include <cstring>
 #include <numbers>
+
+#include "edit/sound_test_support.h"
 
 namespace ondrel {
 namespace {
 
-SampleRef sine_sound(double hz, uint32_t rate, int bits, bool stereo, uint32_t frames, double level = 0.6) {
-    const int channels = stereo ? 2 : 1;
-    SampleRef s = make_sample(frames * static_cast<uint32_t>(channels * bits / 8));
-    s->rate = rate;
-    s->bits = static_cast<int16_t>(bits);
-    s->stereo = stereo;
+// A sine at 0.6 of full scale, the same on both channels of a stereo sound.
+SampleRef sine_sound(double hz, uint32_t rate, int bits, bool stereo, uint32_t frames) {
+    const double full = bits == 16 ? 32767 : 127;
+    std::vector<int> values;
     for (uint32_t i = 0; i < frames; ++i) {
-        const double v = level * std::sin(2 * std::numbers::pi * hz * i / rate);
-        for (int c = 0; c < channels; ++c) {
-            const size_t at = i * static_cast<size_t>(channels) + static_cast<size_t>(c);
-            if (bits == 16) {
-                const auto x = static_cast<int16_t>(std::lround(v * 32767));
-                std::memcpy(s->data + 2 * at, &x, 2);
-            } else {
-                s->data[at] = static_cast<uint8_t>(static_cast<int8_t>(std::lround(v * 127)));
-            }
-        }
+        const double v = 0.6 * std::sin(2 * std::numbers::pi * hz * i / rate);
+        values.insert(values.end(), stereo ? 2 : 1, static_cast<int>(std::lround(v * full)));
     }
+    SampleRef s = test::make_sound({bits, stereo}, values);
+    s->rate = rate;
     return s;
 }
 
