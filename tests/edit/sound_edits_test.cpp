@@ -2,6 +2,7 @@
 // loop points and blocks kept inside the sound, undo giving the sound back.
 #include "edit/sound_edits.h"
 
+#include "edit/song_fixture.h"
 #include "edit/sound_blocks.h"
 #include "edit/sound_frames.h"
 #include "edit/sound_test_support.h"
@@ -10,6 +11,7 @@ namespace ondrel {
 namespace {
 
 using test::make_sound;
+using test::song_bytes;
 using test::values_of;
 constexpr test::SoundFormat k8Mono{8, false}, k8Stereo{8, true}, k16Mono{16, false}, k16Stereo{16, true};
 constexpr int kSlot = 2;
@@ -58,11 +60,11 @@ class SoundTools : public test::EditFixture, public ::testing::WithParamInterfac
 TEST_P(SoundTools, GiveExactValuesAndUndoGivesTheSoundBack) {
     const ToolCase& c = GetParam();
     put_sound(kSlot, make_sound(c.format, c.before));
-    const auto before = snapshot(kSlot);
+    const auto before = song_bytes(engine.bank);
     const bool changes = c.after != c.before;
     EXPECT_EQ(edit([&](SongTransaction& t) { return apply_sound_tool(t, kSlot, c.tool, c.range); }), changes);
     EXPECT_EQ(values_of(sound(kSlot)), c.after);
-    EXPECT_TRUE(!changes || (undo() && snapshot(kSlot) == before));
+    EXPECT_TRUE(!changes || (undo() && song_bytes(engine.bank) == before));
 }
 INSTANTIATE_TEST_SUITE_P(EachFormat, SoundTools, ::testing::ValuesIn(kToolCases),
                          [](const auto& i) { return test_name(i.param.name); });
@@ -165,11 +167,11 @@ TEST_P(FrameEdits, MoveLoopAndBlocksWithTheFramesAndUndo) {
     edit([](SongTransaction& t) {
         return set_sound_block(t, kSlot, 1, {6, 9}) && set_sound_block(t, kSlot, 2, {1, 3});
     });
-    const auto before = snapshot(kSlot);
+    const auto before = song_bytes(engine.bank);
     ASSERT_TRUE(edit(c.edit));
     EXPECT_EQ(values_of(sound(kSlot)), samples_of(format, c.after));
     EXPECT_EQ(marks(), c.marks);
-    EXPECT_TRUE(undo() && snapshot(kSlot) == before);
+    EXPECT_TRUE(undo() && song_bytes(engine.bank) == before);
 }
 INSTANTIATE_TEST_SUITE_P(EachFormat, FrameEdits,
                          ::testing::Combine(::testing::ValuesIn(kFrameFormats),

@@ -2,10 +2,10 @@
 // Small sounds built from their sample values, and an engine with an undo history.
 #include <gtest/gtest.h>
 
-#include <cstring>
 #include <vector>
 
 #include "edit/edit_history.h"
+#include "edit/song_transaction.h"
 #include "engine/engine.h"
 
 namespace ondrel::test {
@@ -56,19 +56,6 @@ protected:
         return said;
     }
     bool undo() { return history.undo(engine.bank, engine.slots); }
-    // The song record and one sound (header and data), to see an undo give them back.
-    std::vector<uint8_t> snapshot(int slot) const {
-        std::vector<uint8_t> out(sizeof(TMOD) + sizeof(p_s));
-        std::memcpy(out.data(), &engine.bank.current(), sizeof(TMOD));
-        if (const p_s* s = sound(slot)) {
-            p_s header;
-            std::memcpy(static_cast<void*>(&header), s, sizeof header);
-            header.data = nullptr;  // where the data lie may differ
-            std::memcpy(out.data() + sizeof(TMOD), &header, sizeof header);
-            if (s->data) out.insert(out.end(), s->data, s->data + s->length);
-        }
-        return out;
-    }
 };
 
 }  // namespace ondrel::test
