@@ -4,8 +4,8 @@
 #include "edit/effect_edits.h"
 
 #include "edit/reverb_edits.h"
+#include "edit/song_fixture.h"
 #include "edit/sound_edits.h"
-#include "edit/sound_test_support.h"
 #include "support/fake_audio_device.h"
 
 namespace ondrel {
@@ -59,7 +59,7 @@ TEST_F(EffectEdits, ClonesStopAtFifteenEchoesRemovalUnroutesAndUndoRestores) {
 TEST_F(EffectEdits, TrackButtonsWalkTheSlotsWithTheirAsymmetry) {
     engine.slots.efxtype[99] = 1;  // a clone in the last slot
     song().tracke[2] = 99;
-    EXPECT_EQ(slot_from([](auto& t) { return mnplusefx(t, 2); }), 1);  // wraps to 1
+    EXPECT_EQ(slot_from([](auto& t) { return mnplusefx(t, 2); }), 1);    // wraps to 1
     EXPECT_EQ(slot_from([](auto& t) { return mnmoinsefx(t, 2); }), 17);  // from 1: on at 98, 99 passed by
     EXPECT_EQ(slot_from([](auto& t) { return mnmoinsefx(t, 3); }), 99);  // from 0: starts at 99 itself
     song().trackg[4] = 1;  // another bank: the word the mixer reads stays

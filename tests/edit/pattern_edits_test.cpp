@@ -184,7 +184,6 @@ TEST(PatternEdits, TransposeStopsAtTheNoteRangeAndCountsWhatStayed) {
     for (const Case& c : cases) {
         SCOPED_TRACE(testing::Message() << "by " << c.semitones << " of instrument " << c.instrument);
         NoteEnds s;
-        ASSERT_EQ(grid(s), kEnds);
         const TransposeResult r =
             edit(s, [&](SongTransaction& t) { return transpose(t, c.range, c.semitones, c.instrument); });
         EXPECT_EQ(std::tie(r.moved, r.out_of_range), std::tie(c.moved, c.out_of_range));

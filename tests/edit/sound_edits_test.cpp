@@ -5,7 +5,6 @@
 #include "edit/song_fixture.h"
 #include "edit/sound_blocks.h"
 #include "edit/sound_frames.h"
-#include "edit/sound_test_support.h"
 
 namespace ondrel {
 namespace {

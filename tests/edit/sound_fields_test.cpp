@@ -2,8 +2,8 @@
 // function, and the blocks command 30 plays.
 #include "edit/sound_fields.h"
 
+#include "edit/song_fixture.h"
 #include "edit/sound_blocks.h"
-#include "edit/sound_test_support.h"
 
 namespace ondrel {
 namespace {

@@ -5,7 +5,7 @@
 #include <cmath>
 #include <numbers>
 
-#include "edit/sound_test_support.h"
+#include "edit/song_fixture.h"
 
 namespace ondrel {
 namespace {
