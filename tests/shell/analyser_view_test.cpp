@@ -32,13 +32,9 @@ TEST(AnalyserPixels, RadarColours) {
 }
 
 TEST(AnalyserPixels, ClassicBars) {
-    struct Case {
-        double x;
-        int height;
-    };
-    const Case cases[] = {{0.0, 0},   {1.0, 8},    {-1.0, 8},    {2.0, 32},
-                          {4.0, 128}, {-4.0, 128}, {100.0, 128}, {0.1, 0}};
-    for (const auto& c : cases) EXPECT_EQ(classic_bar_height(c.x), c.height) << c.x;
+    const std::pair<double, int> heights[] = {{0.0, 0},   {1.0, 8},    {-1.0, 8},    {2.0, 32},
+                                              {4.0, 128}, {-4.0, 128}, {100.0, 128}, {0.1, 0}};
+    for (const auto& [x, height] : heights) EXPECT_EQ(classic_bar_height(x), height) << x;
 
     std::vector<double> x(512, 0.0);
     x[3] = 1.0;

@@ -4,6 +4,7 @@
 
 #include <cmath>
 #include <numbers>
+#include <numeric>
 #include <random>
 #include <vector>
 
@@ -61,9 +62,7 @@ TEST(CFastFourierTransform, SetWindowLooksAtTheWindowAlreadySet) {
     std::vector<double> a(8, 1.0), w(16);
     Hanning(16, w.data());
     fft.DirectFFT(a.data());
-    double sum = 0;
-    for (int i = 0; i < 8; ++i) sum += w[static_cast<size_t>(i)];
-    EXPECT_NEAR(a[0], sum, 1e-12);
+    EXPECT_NEAR(a[0], std::accumulate(w.begin(), w.begin() + 8, 0.0), 1e-12);
 
     CFastFourierTransform other(8);
     EXPECT_TRUE(other.SetWindow(8, Hamming));

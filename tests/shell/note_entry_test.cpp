@@ -136,11 +136,7 @@ TEST_F(NoteEntry, KeypadSlashAndStarChooseThePreviousAndNextInstrument) {
         int16_t after;
     };
     const Case cases[] = {
-        {4, kKeyPadMultiply, 5},
-        {4, kKeyPadDivide, 3},
-        {0, kKeyPadDivide, 0},
-        {127, kKeyPadMultiply, 127},
-    };
+        {4, kKeyPadMultiply, 5}, {4, kKeyPadDivide, 3}, {0, kKeyPadDivide, 0}, {127, kKeyPadMultiply, 127}};
     for (const Case& c : cases) {
         SCOPED_TRACE(std::to_string(c.before) + " " + chord_text(plain(c.key)));
         p.engine.player.cursor.cursnd = c.before;

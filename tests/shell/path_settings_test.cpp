@@ -129,11 +129,9 @@ TEST(PathsMenu, ItemsCarryCodesInAddingOrderAndAreToldApartByIndex) {
 
     // "Remove path", "Add Path To sound" and "Add Path To music" act on the browser's directory,
     // once; sound entries still land last after a music entry has gone.
-    const std::pair<size_t, PathsChoice> clicks[] = {{2, PathsChoice::RemovedDirectory},
-                                                     {2, PathsChoice::Nothing},
-                                                     {1, PathsChoice::AddedDirectory},
-                                                     {1, PathsChoice::Nothing},
-                                                     {0, PathsChoice::AddedDirectory}};
+    using enum PathsChoice;
+    const std::pair<size_t, PathsChoice> clicks[] = {
+        {2, RemovedDirectory}, {2, Nothing}, {1, AddedDirectory}, {1, Nothing}, {0, AddedDirectory}};
     for (const auto& [index, result] : clicks) EXPECT_EQ(settings.choose(index), result) << index;
     EXPECT_EQ(summary(settings, ""), fav + " | " + fav + " /vanished/ondrel | /s/a " + fav);
     EXPECT_EQ(settings.menu[4].code, kAddMusicPathCode + 4);

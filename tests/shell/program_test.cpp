@@ -129,7 +129,7 @@ TEST_F(ProgramTest, UnsavedChangesAreAskedAboutBeforeTheyAreLost) {
     EXPECT_TRUE(quit_work_done);
 }
 
-TEST_F(ProgramTest, KeysReachTheTransportTheOptionsAndTheCursor) {
+TEST_F(ProgramTest, KeysReachTheTransportAndTheCursor) {
     open({kModule});
     p.key_down(plain(kKeyF1 + 4));  // F5
     p.run_pending();

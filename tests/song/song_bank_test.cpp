@@ -16,10 +16,8 @@ TEST(SongBank, SongsAreAddedUpToSixtyThreeAndKeepEachOthersData) {
     bank.t_sound[3] = make_sample(10);
     p_s* sample = bank.t_sound[3].get();
     for (int i = 1; i < kSongsUsable; ++i) ASSERT_TRUE(bank.newmusic()) << i;
-    EXPECT_EQ(bank.nbimod, 63);
-    EXPECT_EQ(bank.noimod, 62);
-    EXPECT_EQ(bank.current().patbase, 62 * 128);
-    EXPECT_EQ(bank.p_pat.size(), 63u * 128);
+    EXPECT_EQ(std::make_tuple(bank.nbimod, bank.noimod, bank.current().patbase, bank.p_pat.size()),
+              std::make_tuple(63, 62, 62 * 128, 63u * 128));
     EXPECT_EQ(bank.pattern(0), first);
     EXPECT_EQ(bank.sample(3), sample);
     EXPECT_EQ(bank.sample(128 + 3), nullptr);
@@ -68,11 +66,9 @@ TEST(SongBank, KillingASongShiftsTheLaterOnesDown) {
     Pattern* last_pattern = bank.pattern(2 * 128 + 4);
     bank.select(1);
     bank.killmusic();
-    EXPECT_EQ(bank.nbimod, 2);
-    EXPECT_EQ(bank.noimod, 1);
     EXPECT_STREQ(bank.current().name, "last");
-    EXPECT_EQ(bank.current().patbase, 128);
-    EXPECT_EQ(bank.current().sndbase, 128);
+    EXPECT_EQ(std::make_tuple(bank.nbimod, bank.noimod, bank.current().patbase, bank.current().sndbase),
+              std::make_tuple(2, 1, 128, 128));
     EXPECT_EQ(bank.pattern(128 + 4), last_pattern);
     EXPECT_EQ(bank.p_pat.size(), 256u);
     bank.killmusic();
