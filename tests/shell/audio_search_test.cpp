@@ -7,6 +7,7 @@
 #include <thread>
 
 #include "browser_tree.h"
+#include "support/wait_until.h"
 
 namespace ondrel {
 namespace {
@@ -14,17 +15,15 @@ namespace {
 using test::TempDir;
 using namespace std::chrono_literals;
 
-// Polls as the window would, once a frame, until the search ends (or 20 s pass).
+// Polls as the window would, once a frame, until the search ends (or the wait gives up).
 std::vector<BrowserEntry> collect(AudioSearch& search, std::vector<SearchProgress>* seen = nullptr) {
     std::vector<BrowserEntry> found;
-    const auto deadline = std::chrono::steady_clock::now() + 20s;
-    while (std::chrono::steady_clock::now() < deadline) {
+    test::wait_until([&] {
         const bool was_running = search.running();
         search.take_results(found);
         if (seen) seen->push_back(search.progress());
-        if (!was_running) break;
-        std::this_thread::sleep_for(1ms);
-    }
+        return !was_running;
+    });
     search.take_results(found);
     return found;
 }

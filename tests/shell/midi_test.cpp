@@ -22,8 +22,7 @@ namespace {
 // A track of the program's empty song plays notes 60 and 64 on MIDI channel channel,
 // with instrument 1, which has no sound; play starts from the first row.
 void make_midi_song(Program& p, int channel, int track = 0) {
-    TMOD& m = p.engine.bank.current();
-    m.trackword1[track] = static_cast<uint16_t>(channel);
+    p.engine.bank.current().trackword1[track] = static_cast<uint16_t>(channel);
     Pattern* pattern = p.engine.bank.song_pattern(0);
     pattern->col[track][0] = TNOTE{60, 0, 0, 1, 0, 0};
     pattern->col[track][8] = TNOTE{64, 0, 0, 1, 0, 0};

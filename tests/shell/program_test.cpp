@@ -5,6 +5,7 @@
 
 #include <filesystem>
 
+#include "edit/song_fixture.h"
 #include "edit/sound_blocks.h"
 #include "shell/editor_cursor.h"
 #include "shell/program_fixture.h"
@@ -263,10 +264,8 @@ TEST(ProgramSoundBlocks, AStartMarkMovesTheBlockAndAnEndMarkResizesIt) {
     for (const Case& c : cases) {
         SCOPED_TRACE(std::to_string(c.first) + " " + std::to_string(c.end));
         Program p;
-        SampleRef s = make_sample(10);
-        s->bits = 8;
-        s->framecode = frame_code(8, false);
-        p.engine.bank.t_sound[size_t(p.engine.player.cursor.cursnd)] = std::move(s);
+        p.engine.bank.t_sound[size_t(p.engine.player.cursor.cursnd)] =
+            test::make_sound({8, false}, std::vector<int>(10, 0));
         p.post(ShellMessage(fourcc("SNbk")).with("block", 1).with("first", 4).with("end", 8));
         ShellMessage drag(fourcc("SNbm"));
         drag.with("block", 1).with("first", c.first);
