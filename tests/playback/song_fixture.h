@@ -54,12 +54,9 @@ protected:
     }
 
     void put(const Put& c) {
-        bank.song_pattern(c.pattern)->col[c.track][c.row] = {static_cast<uint8_t>(c.note),
-                                                             static_cast<uint8_t>(c.volume),
-                                                             0,
-                                                             static_cast<uint8_t>(c.instrument),
-                                                             static_cast<uint8_t>(c.command),
-                                                             static_cast<uint8_t>(c.parameter)};
+        const auto byte = [](int v) { return static_cast<uint8_t>(v); };
+        bank.song_pattern(c.pattern)->col[c.track][c.row] = {
+            byte(c.note), byte(c.volume), 0, byte(c.instrument), byte(c.command), byte(c.parameter)};
     }
     void put(int pattern, int row, int track, int note, int instrument, int command = 0, int parameter = 0,
              int volume = 0) {
