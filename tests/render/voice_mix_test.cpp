@@ -1,6 +1,6 @@
 // Every set of mix loops the CPU runs (each sample width, interpolation, send and output
 // mode, mono and stereo) against a plain reference, over steps on both sides of the
-// vector regimes and counts around the vector widths.
+// vector regimes and counts around the group sizes.
 #include "render/voice_mix.h"
 
 #include <gtest/gtest.h>
@@ -90,7 +90,7 @@ void check(const Case& c) {
 
 TEST(MixLoops, EveryLoopMatchesTheReference) {
     const double steps[] = {0.0, 0.19, 0.5, 0.98, 0.995, 1.5, 1.97, 1.985, 2.6, 7.3};
-    const int counts[] = {1, 7, 8, 9, 17, 883, 4096};
+    const int counts[] = {1, 7, 8, 9, 15, 17, 24, 31, 883, 4096};  // around 8- and 16-frame groups
     for (LoopSet set : {LoopSet::Best, LoopSet::Avx2, LoopSet::Portable}) {
         if (!cpu_runs(set)) continue;
         for (int kind = 0; kind < 14; ++kind) {  // 12 mono kinds, then 2 stereo ones
