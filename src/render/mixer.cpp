@@ -7,6 +7,7 @@
 #include "playback/tables.h"
 #include "render/output_clip.h"
 #include "render/pan_table.h"
+#include "render/pass_arithmetic.h"
 #include "render/voice_mix.h"
 
 namespace ondrel {
@@ -289,6 +290,7 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const
     int m_left = n;
     float* o = out + 2 * c0;
     bool keep_position = true;
+    const PassArithmetic passes(step);
     for (;;) {
         const int64_t adv = static_cast<int64_t>(step * m_left + f);
         if (pos >= end) {
@@ -298,7 +300,7 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const
         auto frames_until_end = [&]() -> int64_t {
             if (pos + adv < end) return m_left;
             if (step <= 0) return pos < end ? m_left : 0;
-            return static_cast<int64_t>(((end - pos) - f) / step);
+            return passes.frames_before(static_cast<double>(end - pos), f);
         };
         int64_t count = frames_until_end();
         if (count < 1) {
@@ -329,9 +331,9 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const
             if (send) written_[k] = 1;
         }
         // x is never negative: its whole part is its floor.
-        const int64_t whole = static_cast<int64_t>(x);
-        pos += whole;
-        f = x - static_cast<double>(whole);
+        const OffsetParts parts = split_offset(x, end - pos);
+        pos += parts.whole;
+        f = parts.fraction;
         o += 2 * cnt;
         if (send) send += cnt;
         if (released && (env & kEnvFade)) v.count1 += static_cast<uint32_t>(adv);
