@@ -7,7 +7,7 @@
 #include "playback/tables.h"
 #include "render/output_clip.h"
 #include "render/pan_table.h"
-#include "render/pass_arithmetic.h"
+#include "render/voice_passes.h"
 #include "render/voice_mix.h"
 
 namespace ondrel {
@@ -26,8 +26,8 @@ Mixer::Mixer(SongBank& bank, EffectSlots& slots, Player& player)
             stereo_loops_[bits16][out] = stereo_mixer(bits16, out_mode);
             for (int interpolate = 0; interpolate < 2; ++interpolate)
                 for (int send = 0; send < 3; ++send)
-                    mono_loops_[bits16][interpolate][send][out] =
-                        mono_mixer(bits16, interpolate, static_cast<SendMode>(send), out_mode);
+                    voice_loops_[bits16][interpolate][send][out] =
+                        voice_mixer(bits16, interpolate, static_cast<SendMode>(send), out_mode);
         }
 }
 
@@ -279,79 +279,39 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const
     const bool sets = !piece_has_setter_ && !muted;
     const OutMode out_mode = sets ? OutMode::Set : OutMode::Add;
     const int out_index = static_cast<int>(out_mode);
-    const StereoMixFn mix_stereo = stereo_loops_[bits16][out_index];
-    const auto& mono_loops = mono_loops_[bits16][interpolate];
-    const MonoMixFn mix_alone =
-        mono_loops[static_cast<int>(send ? SendMode::First : SendMode::None)][out_index];
-    const MonoMixFn mix_adding = mono_loops[static_cast<int>(SendMode::Add)][out_index];
-
-    int64_t pos = v.position;
-    double f = v.fraction;
-    int m_left = n;
-    float* o = out + 2 * c0;
-    bool keep_position = true;
-    const PassArithmetic passes(step);
-    for (;;) {
-        const int64_t adv = static_cast<int64_t>(step * m_left + f);
-        if (pos >= end) {
-            pos = loop_start;
-            v.position = static_cast<uint32_t>(pos);
-        }
-        auto frames_until_end = [&]() -> int64_t {
-            if (pos + adv < end) return m_left;
-            if (step <= 0) return pos < end ? m_left : 0;
-            return passes.frames_before(static_cast<double>(end - pos), f);
-        };
-        int64_t count = frames_until_end();
-        if (count < 1) {
-            if (!loop) {
-                v.active = 0;
-                keep_position = false;
-                break;
-            }
-            if (count == 0) {
-                pos = loop_start;
-                v.position = static_cast<uint32_t>(pos);
-                count = frames_until_end();
-            }
-            if (count < 1) {  // frozen for this piece
-                keep_position = false;
-                break;
-            }
-        }
-        const int cnt = static_cast<int>(count);
-        double x = f;
-        if (muted) {
-            x = f + cnt * step;
-        } else if (stereo) {
-            x = mix_stereo(s->data, pos, x, step, cnt, o, gains);
-        } else {
-            // The first voice into a slot's send buffer sets it, the others add to it.
-            x = (send && written_[k] ? mix_adding : mix_alone)(s->data, pos, x, step, cnt, o, send, gains);
-            if (send) written_[k] = 1;
-        }
-        // x is never negative: its whole part is its floor.
-        const OffsetParts parts = split_offset(x, end - pos);
-        pos += parts.whole;
-        f = parts.fraction;
-        o += 2 * cnt;
-        if (send) send += cnt;
-        if (released && (env & kEnvFade)) v.count1 += static_cast<uint32_t>(adv);
-        if (m_left - cnt != 0 && loop && s->loopend > s->loopstart) {
-            m_left -= cnt;
-            pos = loop_start;
-            continue;
-        }
-        if (end <= pos && !loop) v.active = 0;
-        break;
+    VoicePasses passes{s->data,
+                       loop_start,
+                       end,
+                       step,
+                       loop,
+                       loop && s->loopend > s->loopstart,
+                       v.position,
+                       v.fraction,
+                       out + 2 * c0,
+                       send,
+                       n,
+                       v.position};
+    if (muted) {
+        run_voice_passes(passes, [](int64_t, double, int, float*, float*) {});
+    } else if (stereo) {
+        const StereoMixFn mix_stereo = stereo_loops_[bits16][out_index];
+        run_voice_passes(passes, [&](int64_t pos, double f, int count, float* o, float*) {
+            mix_stereo(s->data, pos, f, step, count, o, gains);
+        });
+    } else {
+        // The first voice into a slot's send buffer sets it, the others add to it.
+        const SendMode send_mode = !send ? SendMode::None : written_[k] ? SendMode::Add : SendMode::First;
+        voice_loops_[bits16][interpolate][static_cast<int>(send_mode)][out_index](passes, gains);
+        if (send && passes.out > out + 2 * c0) written_[k] = 1;
     }
-    if (sets && o > out + 2 * c0) {
+    if (released && (env & kEnvFade)) v.count1 += passes.advanced;
+    if (passes.ended) v.active = 0;
+    if (sets && passes.out > out + 2 * c0) {
         piece_has_setter_ = true;
-        std::fill(o, out + 2 * (c0 + n), 0.0f);  // before any other voice adds there
+        std::fill(passes.out, out + 2 * (c0 + n), 0.0f);  // before any other voice adds there
     }
-    if (!keep_position) return;
-    v.position = static_cast<uint32_t>(pos);
-    v.fraction = static_cast<float>(f);
+    v.position = static_cast<uint32_t>(passes.position);
+    if (passes.keeps) v.fraction = static_cast<float>(passes.f);
 }
 
 bool Mixer::effect_stage(float* out, int frames, TMOD& m) {

@@ -86,7 +86,7 @@ private:
     const std::array<float, 128>& tab_pan_;
     const std::array<float, 128>& floatnote_;
     // The mix loops this CPU runs, picked once: [16-bit][interpolated][SendMode][OutMode].
-    MonoMixFn mono_loops_[2][2][3][2]{};
+    VoiceMixFn voice_loops_[2][2][3][2]{};
     StereoMixFn stereo_loops_[2][2]{};  // [16-bit][OutMode]
     EffectProcessor* units_ = nullptr;
     OutputRecorder* recorder_ = nullptr;

@@ -1,5 +1,6 @@
 #include "render/voice_mix.h"
 
+#include "render/voice_passes.h"
 #include "render/voice_mix_simd.h"
 
 namespace ondrel {
@@ -36,6 +37,18 @@ double mix_mono(const void* data, int64_t pos, double f, double step, int count,
         if constexpr (Send == SendMode::Add) send[i] += s * g.send;
     }
     return f + count * step;
+}
+
+template <typename S, bool Interpolate, SendMode Send, OutMode Out>
+void mix_voice(VoicePasses& passes, const MixGains& g) {
+    bool first = true;
+    run_voice_passes(passes, [&](int64_t pos, double f, int count, float* out, float* send) {
+        if (Send == SendMode::First && !first)
+            mix_mono<S, Interpolate, SendMode::Add, Out>(passes.data, pos, f, passes.step, count, out, send, g);
+        else
+            mix_mono<S, Interpolate, Send, Out>(passes.data, pos, f, passes.step, count, out, send, g);
+        first = false;
+    });
 }
 
 template <typename S, OutMode Out>
@@ -89,6 +102,19 @@ StereoMixFn pick_stereo(bool bits16) {
     return bits16 ? mix_stereo<sample16_t, Out> : mix_stereo<int8_t, Out>;
 }
 
+template <OutMode Out, typename S>
+VoiceMixFn pick_voice(bool interpolate, SendMode send) {
+    switch (send) {
+        case SendMode::None:
+            return interpolate ? mix_voice<S, true, SendMode::None, Out> : mix_voice<S, false, SendMode::None, Out>;
+        case SendMode::First:
+            return interpolate ? mix_voice<S, true, SendMode::First, Out> : mix_voice<S, false, SendMode::First, Out>;
+        case SendMode::Add:
+            return interpolate ? mix_voice<S, true, SendMode::Add, Out> : mix_voice<S, false, SendMode::Add, Out>;
+    }
+    return nullptr;
+}
+
 }  // namespace
 
 bool cpu_runs(LoopSet set) {
@@ -105,6 +131,16 @@ MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, 
     if (set != LoopSet::Portable && has_avx2()) return avx2::mono_mixer(bits16, interpolate, send, out);
     return out == OutMode::Set ? pick_mono<OutMode::Set>(bits16, interpolate, send)
                                : pick_mono<OutMode::Add>(bits16, interpolate, send);
+}
+
+VoiceMixFn voice_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, LoopSet set) {
+    if (set == LoopSet::Best && has_avx512()) return avx512::voice_mixer(bits16, interpolate, send, out);
+    if (set != LoopSet::Portable && has_avx2()) return avx2::voice_mixer(bits16, interpolate, send, out);
+    if (out == OutMode::Set)
+        return bits16 ? pick_voice<OutMode::Set, sample16_t>(interpolate, send)
+                      : pick_voice<OutMode::Set, int8_t>(interpolate, send);
+    return bits16 ? pick_voice<OutMode::Add, sample16_t>(interpolate, send)
+                  : pick_voice<OutMode::Add, int8_t>(interpolate, send);
 }
 
 StereoMixFn stereo_mixer(bool bits16, OutMode out, LoopSet set) {

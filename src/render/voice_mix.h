@@ -25,6 +25,11 @@ using MonoMixFn = double (*)(const void* data, int64_t pos, double x, double ste
 using StereoMixFn = double (*)(const void* data, int64_t pos, double x, double step, int count, float* out,
                                const MixGains& g);
 
+// A mono voice's passes over a piece, in one call (render/voice_passes.h). With
+// SendMode::First the first pass sets the send buffer and the others add to it.
+struct VoicePasses;
+using VoiceMixFn = void (*)(VoicePasses& passes, const MixGains& g);
+
 // The sets of loops: the best this CPU runs, or a lesser one (for tests and comparisons).
 enum class LoopSet { Best, Avx2, Portable };
 bool cpu_runs(LoopSet set);
@@ -33,5 +38,6 @@ bool cpu_runs(LoopSet set);
 // portable loops.
 MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, LoopSet set = LoopSet::Best);
 StereoMixFn stereo_mixer(bool bits16, OutMode out, LoopSet set = LoopSet::Best);
+VoiceMixFn voice_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, LoopSet set = LoopSet::Best);
 
 }  // namespace ondrel

@@ -10,6 +10,7 @@
 #include <random>
 #include <vector>
 
+#include "render/voice_passes.h"
 #include "song/sample.h"
 
 namespace ondrel {
@@ -107,6 +108,76 @@ TEST(MixLoops, EveryLoopMatchesTheReference) {
                         }
         }
     }
+}
+
+// A voice's passes over a piece through each set's voice loops: the same positions, ends
+// and fade clock as the portable ones, nearly the same frames; with a send buffer the
+// first pass sets it and the later ones add to it.
+TEST(MixLoops, EverySetRunsAVoicesPassesAlike) {
+    struct VoiceCase {
+        const char* what;
+        int64_t pos, loop_start, end;
+        bool loop;
+        double f, step;
+        int frames;
+    };
+    const VoiceCase cases[] = {
+        {"a short loop played low", 2, 4, 20, true, 0.25, 0.3127, 700},
+        {"a long loop, many groups a pass", 0, 8, 300, true, 0.5, 1.37, 900},
+        {"a loop past the gather step", 0, 0, 40, true, 0.0, 2.6, 333},
+        {"a one-shot that ends", 10, 0, 90, false, 0.75, 0.9, 200},
+        {"an empty loop", 30, 12, 12, true, 0.0, 1.0, 50},
+        {"standing still", 5, 0, 64, true, 0.5, 0.0, 40},
+    };
+    const auto data = random_data(512, 2, 5);
+    const MixGains g{0.25f, -0.5f, 0.125f};
+    for (const VoiceCase& c : cases)
+        for (bool bits16 : {false, true})
+            for (SendMode send : {SendMode::None, SendMode::First, SendMode::Add}) {
+                SCOPED_TRACE(testing::Message() << c.what << " bits16 " << bits16 << " send " << static_cast<int>(send));
+                struct Result {
+                    VoicePasses passes;
+                    std::vector<float> out, send;
+                };
+                auto run = [&](LoopSet set) {
+                    Result r{{data.data(), c.loop_start, c.end, c.step, c.loop, c.loop && c.end > c.loop_start,
+                              c.pos, c.f, nullptr, nullptr, c.frames, c.pos},
+                             std::vector<float>(2 * c.frames, 1.0f), std::vector<float>(c.frames, 2.0f)};
+                    r.passes.out = r.out.data();
+                    r.passes.send = send == SendMode::None ? nullptr : r.send.data();
+                    voice_mixer(bits16, true, send, OutMode::Add, set)(r.passes, g);
+                    return r;
+                };
+                const Result want = run(LoopSet::Portable);
+                const int mixed = static_cast<int>(want.passes.out - want.out.data()) / 2;
+                const bool wraps = c.loop && c.end > c.loop_start && c.step > 0;
+                if (wraps) {
+                    EXPECT_EQ(mixed, c.frames);
+                }
+                if (send != SendMode::None && wraps) {
+                    // The first frame's send value is set or added as asked; past the first
+                    // wrap every value is added.
+                    const float first_sample = (want.out[0] - 1.0f) / g.left;
+                    EXPECT_NEAR(want.send[0], (send == SendMode::First ? 0.0f : 2.0f) + first_sample * g.send, 1e-3f);
+                    const int late = mixed - 1;
+                    EXPECT_NEAR(want.send[late], 2.0f + (want.out[2 * late] - 1.0f) / g.left * g.send, 1e-3f);
+                }
+                // Offsets in single precision move a 16-bit value by up to about one.
+                const float near = bits16 ? 1.0f : 0.02f;
+                for (LoopSet set : {LoopSet::Best, LoopSet::Avx2}) {
+                    if (!cpu_runs(set)) continue;
+                    const Result got = run(set);
+                    EXPECT_EQ(got.passes.pos, want.passes.pos);
+                    EXPECT_EQ(got.passes.f, want.passes.f);
+                    EXPECT_EQ(got.passes.position, want.passes.position);
+                    EXPECT_EQ(got.passes.keeps, want.passes.keeps);
+                    EXPECT_EQ(got.passes.ended, want.passes.ended);
+                    EXPECT_EQ(got.passes.advanced, want.passes.advanced);
+                    EXPECT_EQ(got.passes.out, got.out.data() + 2 * mixed);
+                    for (int i = 0; i < 2 * c.frames; ++i) ASSERT_NEAR(got.out[i], want.out[i], near) << i;
+                    for (int i = 0; i < c.frames; ++i) ASSERT_NEAR(got.send[i], want.send[i], near) << i;
+                }
+            }
 }
 
 }  // namespace
