@@ -272,11 +272,14 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const
     const float q = s->bits == 8 ? 0.0078125f : 3.0517578e-05f;
     const MixGains gains{q * gl, q * gr, q * (send_level * master * g)};
     const bool interpolate = piece.interpolate || (s->flag2 & 1);
-    const bool muted = mute[track].load(std::memory_order_relaxed) != 0;
+    // A voice at volume 0 (a note faded or cut, still playing on) adds nothing: like a muted
+    // one it only moves on, and leaves the piece's frames and the send buffer to the others.
+    const bool silent = gains.left == 0 && gains.right == 0 && (!send || gains.send == 0);
+    const bool heard = !silent && mute[track].load(std::memory_order_relaxed) == 0;
     const bool stereo = s->stereo != 0;
     const bool bits16 = s->bits == 16;
 
-    const bool sets = !piece_has_setter_ && !muted;
+    const bool sets = !piece_has_setter_ && heard;
     const OutMode out_mode = sets ? OutMode::Set : OutMode::Add;
     const int out_index = static_cast<int>(out_mode);
     VoicePasses passes{s->data,
@@ -291,7 +294,7 @@ void Mixer::render_voice(int vi, float* out, int c0, int n, const TMOD& m, const
                        send,
                        n,
                        v.position};
-    if (muted) {
+    if (!heard) {
         run_voice_passes(passes, [](int64_t, double, int, float*, float*) {});
     } else if (stereo) {
         const StereoMixFn mix_stereo = stereo_loops_[bits16][out_index];

@@ -124,6 +124,13 @@ TEST_F(Mix, VoicesAddOverOneThatEndedOrIsMuted) {
     mixer.mute[1] = 1;  // the first voice heard is now the third
     out = render(4);
     for (int i = 0; i < 4; ++i) EXPECT_NEAR(right(out, i), centred_right(10), kTol) << i;
+    mixer.mute[1] = 0;  // at volume 0 it is skipped as if muted, yet plays on
+    Voice& quiet = player.nlist[1];
+    quiet.volume = 0;
+    const uint32_t at = quiet.position;
+    out = render(4);
+    for (int i = 0; i < 4; ++i) EXPECT_NEAR(right(out, i), centred_right(10), kTol) << i;
+    EXPECT_EQ(quiet.position, at + 4);
 }
 
 TEST_F(Mix, SixteenBitStereoAndTheClip) {
