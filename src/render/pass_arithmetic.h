@@ -1,8 +1,8 @@
 #pragma once
 // The arithmetic from one pass over a sample to the next. A voice on a short loop makes
-// a pass every few dozen frames, each starting from the last one's fraction, so the
-// latency of this chain, not the mixing, bounds such voices. Both functions give exactly
-// what the plain expressions in their comments give.
+// a pass every few dozen frames, each starting from the last one's fraction: a chain of
+// dependent steps that a division and integer round trips would lengthen. Both functions
+// give exactly what the plain expressions in their comments give.
 #include <cstdint>
 
 namespace ondrel {
