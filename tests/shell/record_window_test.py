@@ -70,8 +70,13 @@ try:
         silent, _ = colours_in(shot("fft-silent"), ANALYSER_IMAGE)
         check("the analyser of silence is black", silent == {b"\0\0\0"}, f"{len(silent)} colours")
         run("xdotool", "key", "--window", window, "F5")
-        time.sleep(1.0)
-        drawn, first = colours_in(shot("fft-1"), ANALYSER_IMAGE)
+        # The song opens sparse, a bar or two at the left: wait for more of it (longer on a
+        # loaded machine).
+        for _ in range(8):
+            time.sleep(0.5)
+            drawn, first = colours_in(shot("fft-1"), ANALYSER_IMAGE)
+            if len(drawn) > 3:
+                break
         check("the analyser draws the song", len(drawn) > 3, f"{len(drawn)} colours")
         time.sleep(0.5)
         _, second = colours_in(shot("fft-2"), ANALYSER_IMAGE)
