@@ -9,10 +9,12 @@ namespace ondrel {
 
 namespace {
 
+// A NaN (from an effect unit driven wild) goes out as -1, as the vector max makes it, never
+// to the device.
 Peaks clip_frames(float* out, int from, int frames, Peaks p) {
     for (int i = from; i < frames; ++i) {
-        const float l = std::min(std::max(out[2 * i] * 0.25f, -1.0f), 1.0f);
-        const float r = std::min(std::max(out[2 * i + 1] * 0.25f, -1.0f), 1.0f);
+        const float l = std::min(std::max(-1.0f, out[2 * i] * 0.25f), 1.0f);
+        const float r = std::min(std::max(-1.0f, out[2 * i + 1] * 0.25f), 1.0f);
         out[2 * i] = l;
         out[2 * i + 1] = r;
         p.left = std::max(p.left, std::fabs(l));
@@ -53,17 +55,29 @@ __attribute__((target("avx2"))) Peaks clip_avx2(float* out, int frames) {
 #pragma GCC diagnostic ignored "-Wuninitialized"
 #pragma GCC diagnostic ignored "-Wmaybe-uninitialized"
 
-// Clips sixteen values (eight frames) in place, only those in mask; returns their magnitudes.
+// Clips sixteen scaled values (eight frames) in place, only those in mask; returns their
+// magnitudes.
 __attribute__((target("avx512f"))) inline __m512 clip16(float* o, __mmask16 mask) {
-    const __m512 v =
-        _mm512_min_ps(_mm512_max_ps(_mm512_mul_ps(_mm512_maskz_loadu_ps(mask, o), _mm512_set1_ps(0.25f)),
-                                    _mm512_set1_ps(-1.0f)),
-                      _mm512_set1_ps(1.0f));
+    const __m512 v = _mm512_min_ps(_mm512_max_ps(_mm512_maskz_loadu_ps(mask, o), _mm512_set1_ps(-1.0f)),
+                                   _mm512_set1_ps(1.0f));
     _mm512_mask_storeu_ps(o, mask, v);
     return _mm512_abs_ps(v);
 }
 
-__attribute__((target("avx512f"))) Peaks clip_avx512(float* out, int frames) {
+// Each channel's largest lane: left in the even lanes, right in the odd.
+__attribute__((target("avx512f"))) Peaks channel_peaks(__m512 magnitudes) {
+    alignas(64) float lanes[16];
+    _mm512_store_ps(lanes, magnitudes);
+    Peaks p{0, 0};
+    for (int k = 0; k < 16; k += 2) {
+        p.left = std::max(p.left, lanes[k]);
+        p.right = std::max(p.right, lanes[k + 1]);
+    }
+    return p;
+}
+
+// Clips values already scaled.
+__attribute__((target("avx512f"))) Peaks clip_scaled_avx512(float* out, int frames) {
     __m512 peak = _mm512_setzero_ps();
     __m512 peak2 = _mm512_setzero_ps();
     int i = 0;
@@ -75,14 +89,42 @@ __attribute__((target("avx512f"))) Peaks clip_avx512(float* out, int frames) {
         const int values = 2 * std::min(frames - i, 8);
         peak = _mm512_max_ps(peak, clip16(out + 2 * i, static_cast<__mmask16>((1u << values) - 1)));
     }
-    alignas(64) float lanes[16];
-    _mm512_store_ps(lanes, _mm512_max_ps(peak, peak2));
-    Peaks p{0, 0};
-    for (int k = 0; k < 16; k += 2) {
-        p.left = std::max(p.left, lanes[k]);
-        p.right = std::max(p.right, lanes[k + 1]);
+    return channel_peaks(_mm512_max_ps(peak, peak2));
+}
+
+// Scales sixteen values in place and widens the running extremes. max and min pass a NaN by,
+// so it is looked for apart.
+__attribute__((target("avx512f"))) inline void scale16(float* o, __mmask16 mask, __m512& high, __m512& low,
+                                                       __mmask16& nan) {
+    const __m512 v = _mm512_mul_ps(_mm512_maskz_loadu_ps(mask, o), _mm512_set1_ps(0.25f));
+    _mm512_mask_storeu_ps(o, mask, v);
+    high = _mm512_max_ps(v, high);
+    low = _mm512_min_ps(v, low);
+    nan = static_cast<__mmask16>(nan | _mm512_cmp_ps_mask(v, v, _CMP_UNORD_Q));
+}
+
+// Music seldom needs clipping once scaled: a pass that only scales and finds the extremes
+// does less per value, and the clip runs over the scaled values only when they call for it.
+__attribute__((target("avx512f"))) Peaks clip_avx512(float* out, int frames) {
+    __m512 high = _mm512_setzero_ps(), high2 = _mm512_setzero_ps();
+    __m512 low = _mm512_setzero_ps(), low2 = _mm512_setzero_ps();
+    __mmask16 nan = 0;
+    int i = 0;
+    for (; i + 16 <= frames; i += 16) {
+        scale16(out + 2 * i, 0xffff, high, low, nan);
+        scale16(out + 2 * i + 16, 0xffff, high2, low2, nan);
     }
-    return p;
+    for (; i < frames; i += 8) {
+        const int values = 2 * std::min(frames - i, 8);
+        scale16(out + 2 * i, static_cast<__mmask16>((1u << values) - 1), high, low, nan);
+    }
+    high = _mm512_max_ps(high, high2);
+    low = _mm512_min_ps(low, low2);
+    const __mmask16 over = _mm512_cmp_ps_mask(high, _mm512_set1_ps(1.0f), _CMP_GT_OQ) |
+                           _mm512_cmp_ps_mask(low, _mm512_set1_ps(-1.0f), _CMP_LT_OQ);
+    if (over == 0 && nan == 0)
+        return channel_peaks(_mm512_max_ps(high, _mm512_sub_ps(_mm512_setzero_ps(), low)));
+    return clip_scaled_avx512(out, frames);
 }
 
 #pragma GCC diagnostic pop
