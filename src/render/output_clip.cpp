@@ -131,11 +131,10 @@ __attribute__((target("avx512f"))) Peaks clip_avx512(float* out, int frames) {
 
 }  // namespace
 
-Peaks headroom_and_clip(float* out, int frames) {
-    static const bool avx512 = __builtin_cpu_supports("avx512f");
-    static const bool avx2 = __builtin_cpu_supports("avx2");
-    if (avx512) return clip_avx512(out, frames);
-    return avx2 ? clip_avx2(out, frames) : clip_frames(out, 0, frames, {0, 0});
+Peaks headroom_and_clip(float* out, int frames, LoopSet set) {
+    if (set == LoopSet::Best && has_avx512()) return clip_avx512(out, frames);
+    if (set != LoopSet::Portable && has_avx2()) return clip_avx2(out, frames);
+    return clip_frames(out, 0, frames, {0, 0});
 }
 
 }  // namespace ondrel

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "render/loop_set.h"
+
 namespace ondrel {
 
 struct Peaks {
@@ -9,6 +11,6 @@ struct Peaks {
 
 // The mixer's headroom: every sample of the interleaved stereo buffer times 0.25, clipped
 // to [-1, 1]; returns the largest magnitude of each channel.
-Peaks headroom_and_clip(float* out, int frames);
+Peaks headroom_and_clip(float* out, int frames, LoopSet set = LoopSet::Best);
 
 }  // namespace ondrel

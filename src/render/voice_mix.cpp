@@ -65,17 +65,6 @@ double mix_stereo(const void* data, int64_t pos, double f, double step, int coun
     return f + count * step;
 }
 
-bool has_avx2() {
-    static const bool yes = __builtin_cpu_supports("avx2") && __builtin_cpu_supports("fma");
-    return yes;
-}
-
-bool has_avx512() {
-    static const bool yes =
-        has_avx2() && __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512vl");
-    return yes;
-}
-
 template <typename S, OutMode Out>
 MonoMixFn pick_mono(bool interpolate, SendMode send) {
     switch (send) {
@@ -116,15 +105,6 @@ VoiceMixFn pick_voice(bool interpolate, SendMode send) {
 }
 
 }  // namespace
-
-bool cpu_runs(LoopSet set) {
-    switch (set) {
-        case LoopSet::Best:
-        case LoopSet::Portable: return true;
-        case LoopSet::Avx2: return has_avx2();
-    }
-    return false;
-}
 
 MonoMixFn mono_mixer(bool bits16, bool interpolate, SendMode send, OutMode out, LoopSet set) {
     if (set == LoopSet::Best && has_avx512()) return avx512::mono_mixer(bits16, interpolate, send, out);

@@ -3,6 +3,8 @@
 // send mode, stereo) so that no test is made per frame.
 #include <cstdint>
 
+#include "render/loop_set.h"
+
 namespace ondrel {
 
 typedef int16_t __attribute__((may_alias)) sample16_t;  // sample data lives in a byte block
@@ -29,10 +31,6 @@ using StereoMixFn = double (*)(const void* data, int64_t pos, double x, double s
 // SendMode::First the first pass sets the send buffer and the others add to it.
 struct VoicePasses;
 using VoiceMixFn = void (*)(VoicePasses& passes, const MixGains& g);
-
-// The sets of loops: the best this CPU runs, or a lesser one (for tests and comparisons).
-enum class LoopSet { Best, Avx2, Portable };
-bool cpu_runs(LoopSet set);
 
 // The loop for a case; bits16 selects 16-bit data. A set the CPU cannot run gives the
 // portable loops.
