@@ -31,6 +31,7 @@ for f in "$corpus"/sound/*; do
 done
 { printf '\x00'; cat "$seeds/otm/demo.otm"; } > "$seeds/play/otm"
 for f in "$seeds"/mod/* "$seeds"/s3m/* "$seeds"/mtm/*; do
+  [ -f "$f" ] || continue  # no corpus beside the checkout: the globs stay unexpanded
   case "$f" in */mod/*) k='\x01';; */s3m/*) k='\x06';; *) k='\x03';; esac
   { printf "$k"; head -c 60000 "$f"; } > "$seeds/play/$(basename "$f")"
 done
