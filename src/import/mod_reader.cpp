@@ -38,6 +38,25 @@ Layout layout_of(const uint8_t* sig) {
     return {};
 }
 
+// Marks of the other module formats. Under a name that selects no reader, a file carrying
+// one would be read as a 15-sample MOD of garbage; it is refused, saying what it is.
+struct ForeignMark {
+    size_t at;
+    const char* mark;
+    const char* refusal;
+};
+constexpr ForeignMark kForeignMarks[] = {
+    {0, "Extended Module: ", "a FastTracker Module under another name; those are not supported yet"},
+    {44, "SCRM", "a Scream Tracker Module under another name: give it the .s3m ending to load it"},
+    {0, "MTM\x10", "a MultiTracker Module under another name: give it the .mtm ending to load it"},
+};
+
+const char* foreign_refusal(const uint8_t* head) {
+    for (const ForeignMark& f : kForeignMarks)
+        if (std::memcmp(head + f.at, f.mark, std::strlen(f.mark)) == 0) return f.refusal;
+    return nullptr;
+}
+
 TNOTE mod_cell(const uint8_t* c) {
     TNOTE cell{};
     const int period = (c[0] & 0x0f) << 8 | c[1];
@@ -95,11 +114,17 @@ bool read_mod(ByteReader& file, ModuleRead& out) {
         out.error = "too short to be a module (" + std::to_string(file.size()) + " bytes)";
         return false;
     }
-    TMOD& m = *out.song.mod;
-    preset_foreign_song(m, 1);
     uint8_t head[kHeader31] = {};
     file.read(head, sizeof head);
     const Layout lay = layout_of(head + 1080);
+    if (lay.samples == 15) {
+        if (const char* refusal = foreign_refusal(head)) {
+            out.error = refusal;
+            return false;
+        }
+    }
+    TMOD& m = *out.song.mod;
+    preset_foreign_song(m, 1);
     char title[21] = {};
     std::memcpy(title, head, 20);
     set_text(m.name, title, 20);

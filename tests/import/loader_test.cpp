@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
+
 #include "support/temp_dir.h"
 
 namespace ondrel {
@@ -68,6 +70,17 @@ TEST_F(LoaderTest, RefusedFilesLeaveTheSongTheUserHad) {
          {std::vector<uint8_t>{'n', 'o', 'p', 'e', 0, 0, 0, 0}, std::vector<uint8_t>{}})
         EXPECT_FALSE(load(dir.write("junk.otm", junk), bank, slots).ok);
     EXPECT_FALSE(load(dir.write("song.xm", {1, 2, 3}), bank, slots).ok);  // known, not read yet
+    // Another format's module under a name read as MOD: refused, saying what it is.
+    std::vector<uint8_t> xm(1200);
+    std::memcpy(xm.data(), "Extended Module: tune", 21);
+    const std::pair<std::string, const char*> misnamed[] = {{dir.write("tune.mod", xm), "FastTracker"},
+                                                            {copy_of("s3m-rules.s3m", "s.mod"), ".s3m"},
+                                                            {copy_of("mtm-rules.mtm", "m.mod"), ".mtm"}};
+    for (const auto& [path, said] : misnamed) {
+        const LoadResult r = load(path, bank, slots);
+        EXPECT_FALSE(r.ok) << path;
+        EXPECT_NE(r.error.find(said), std::string::npos) << r.error;
+    }
     bank.fmulload = 1;
     EXPECT_FALSE(load(dir.write("bad.otm", {'x'}), bank, slots).ok);
     expect_mine_kept();
