@@ -162,13 +162,16 @@ private:
 int main(int argc, char** argv) {
     std::string corpus = "../shared/corpus";
     int runs = 5;
+    bool ours_only = false;  // for profiling our side alone
     for (int i = 1; i < argc; ++i) {
-        if (!std::strcmp(argv[i], "--runs") && i + 1 < argc)
+        if (!std::strcmp(argv[i], "--ours-only"))
+            ours_only = true;
+        else if (!std::strcmp(argv[i], "--runs") && i + 1 < argc)
             runs = std::max(1, std::atoi(argv[++i]));
         else if (!std::strcmp(argv[i], "--corpus") && i + 1 < argc)
             corpus = argv[++i];
         else {
-            std::fprintf(stderr, "usage: bench_peers [--runs N] [--corpus DIR]\n");
+            std::fprintf(stderr, "usage: bench_peers [--runs N] [--corpus DIR] [--ours-only]\n");
             return 2;
         }
     }
@@ -194,6 +197,11 @@ int main(int argc, char** argv) {
         const double song_seconds = ours.render().audio_seconds;
         if (song_seconds <= 0) {  // a file our loader refuses (another format under a .mod name)
             std::printf("%-36s refused by our loader, left out\n", path.filename().string().c_str());
+            continue;
+        }
+        if (ours_only) {
+            std::printf("%-36s %8.1f %9.0f\n", path.filename().string().c_str(), song_seconds,
+                        medians_of(runs, {[&] { return ours.render(); }})[0].x());
             continue;
         }
         Openmpt openmpt(data);
