@@ -10,7 +10,10 @@ work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 chmod 755 "$work"  # apt fetches as its own user
 mkdir -p "$dir/mod" "$dir/s3m"
-(cd "$work" && apt-get download "${packages[@]}" >/dev/null 2> >(grep -v unsandboxed >&2))
+if ! (cd "$work" && apt-get download "${packages[@]}" >/dev/null 2> >(grep -v unsandboxed >&2)); then
+  echo "wider-set: the packages could not be fetched (apt-get update first?)" >&2
+  exit 1
+fi
 for deb in "$work"/*.deb; do dpkg-deb -x "$deb" "$work/root"; done
 find "$work/root" -type f -iname '*.mod' -exec cp {} "$dir/mod/" \;
 find "$work/root" -type f -iname '*.s3m' -exec cp {} "$dir/s3m/" \;
